@@ -1,0 +1,28 @@
+// OECore: every public header in one include.
+#pragma once
+
+#include <oecore/version.h>
+
+#include <oecore/core/cachable.h>
+#include <oecore/core/cacheref.h>
+#include <oecore/core/class.h>
+#include <oecore/core/collection.h>
+#include <oecore/core/collectionpolicies.h>
+#include <oecore/core/engineobject.h>
+#include <oecore/core/enumerator.h>
+#include <oecore/core/event.h>
+#include <oecore/core/exception.h>
+#include <oecore/core/loglevel.h>
+#include <oecore/core/ref.h>
+#include <oecore/core/refcnt.h>
+#include <oecore/core/refvec.h>
+#include <oecore/core/resourceobject.h>
+#include <oecore/core/string.h>
+#include <oecore/core/stringbuilder.h>
+#include <oecore/core/stringutils.h>
+#include <oecore/core/unicodeutils.h>
+#include <oecore/core/vec.h>
+
+#include <oecore/config/boxedvalue.h>
+#include <oecore/config/classmetadata.h>
+#include <oecore/config/valueparsers.h>

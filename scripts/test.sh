@@ -1,0 +1,16 @@
+#!/usr/bin/env bash
+# Installs what the build needs, then runs the whole test suite: everything
+# under AddressSanitizer and UndefinedBehaviorSanitizer, and the concurrency
+# tests once more under ThreadSanitizer.
+set -euo pipefail
+root=$(cd "$(dirname "$0")/.." && pwd)
+bash "$root/scripts/setup.sh"
+
+bash "$root/scripts/build.sh" asan -DCMAKE_BUILD_TYPE=Debug -DOECORE_SANITIZE=address,undefined \
+  -DOECORE_BUILD_BENCHMARKS=OFF
+ASAN_OPTIONS=detect_leaks=1:strict_string_checks=1 UBSAN_OPTIONS=print_stacktrace=1 \
+  ctest --test-dir "$root/build/asan" --output-on-failure --parallel "$(nproc)"
+
+bash "$root/scripts/build.sh" tsan -DCMAKE_BUILD_TYPE=Debug -DOECORE_SANITIZE=thread \
+  -DOECORE_BUILD_BENCHMARKS=OFF -- --target test_core_concurrency
+TSAN_OPTIONS=halt_on_error=1 ctest --test-dir "$root/build/tsan" -L concurrency --output-on-failure

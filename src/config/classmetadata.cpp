@@ -1,0 +1,99 @@
+#include <oecore/config/boxedvalue.h>
+#include <oecore/config/classmetadata.h>
+#include <oecore/config/valueparsers.h>
+#include <oecore/core/engineobject.h>
+#include <oecore/core/exception.h>
+#include <oecore/core/stringbuilder.h>
+
+#include <tinyxml.h>
+
+namespace {
+
+OmbString elementText(TiXmlElement* element) {
+    const char* text = element ? element->GetText() : nullptr;
+    return text ? OmbString(text) : OmbString();
+}
+
+[[noreturn]] void conversionFailed(const OmbString& text, const ClassMetaData& type, TiXmlElement* element) {
+    OmbStringBuilder message;
+    message << "Failed to convert '" << text << "' to type " << type.name() << ".";
+    if (element && element->Row() > 0) message << " (row " << element->Row() << ", column " << element->Column() << ")";
+    OMB_THROW(XmlParserError, message.str());
+}
+
+template <class T, class Parse>
+OmbRef<OmbRefCnt> parseBoxed(const ClassMetaData& type, TiXmlElement* element, Parse parse) {
+    const OmbString text = elementText(element);
+    T value{};
+    if (!parse(text, value)) conversionFailed(text, type, element);
+    return OmbBoxedValue<T>::box(value);
+}
+
+}  // namespace
+
+OmbRef<OmbRefCnt> AbstractClassMetaData::createInstance(OmbXmlParserContext&, TiXmlElement*) {
+    OMB_THROW(XmlAbstractClass, name());
+}
+
+IntMetaData& IntMetaData::instance() {
+    static IntMetaData metaData;
+    return metaData;
+}
+
+OmbRef<OmbRefCnt> IntMetaData::createInstance(OmbXmlParserContext&, TiXmlElement* element) {
+    return parseBoxed<long long>(*this, element, [](const OmbString& t, long long& v) { return parseInt(t, v); });
+}
+
+DoubleMetaData& DoubleMetaData::instance() {
+    static DoubleMetaData metaData;
+    return metaData;
+}
+
+OmbRef<OmbRefCnt> DoubleMetaData::createInstance(OmbXmlParserContext&, TiXmlElement* element) {
+    return parseBoxed<double>(*this, element, [](const OmbString& t, double& v) { return parseDouble(t, v); });
+}
+
+BoolMetaData& BoolMetaData::instance() {
+    static BoolMetaData metaData;
+    return metaData;
+}
+
+OmbRef<OmbRefCnt> BoolMetaData::createInstance(OmbXmlParserContext&, TiXmlElement* element) {
+    return parseBoxed<bool>(*this, element, [](const OmbString& t, bool& v) { return parseBool(t, v); });
+}
+
+StringMetaData& StringMetaData::instance() {
+    static StringMetaData metaData;
+    return metaData;
+}
+
+OmbRef<OmbRefCnt> StringMetaData::createInstance(OmbXmlParserContext&, TiXmlElement* element) {
+    return OmbBoxedValue<OmbString>::box(elementText(element));
+}
+
+CommentMetaData& CommentMetaData::instance() {
+    static CommentMetaData metaData;
+    return metaData;
+}
+
+OmbRef<OmbRefCnt> CommentMetaData::createInstance(OmbXmlParserContext&, TiXmlElement*) { return OmbRef<OmbRefCnt>(); }
+
+bool ChildObjectModeMetaData::fromString(const OmbString& text, int& value) {
+    if (text == OmbString::literal("TopLevel")) {
+        value = static_cast<int>(OmbChildObjectMode::TopLevel);
+        return true;
+    }
+    if (text == OmbString::literal("AllLevels")) {
+        value = static_cast<int>(OmbChildObjectMode::AllLevels);
+        return true;
+    }
+    return false;
+}
+
+OmbString ChildObjectModeMetaData::toString(int value) {
+    switch (static_cast<OmbChildObjectMode>(value)) {
+        case OmbChildObjectMode::TopLevel: return OmbString::literal("TopLevel");
+        case OmbChildObjectMode::AllLevels: return OmbString::literal("AllLevels");
+    }
+    return OmbString();
+}

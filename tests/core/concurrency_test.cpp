@@ -1,0 +1,128 @@
+// Races on reference counts, weak records, strings and class ids. Run under
+// ThreadSanitizer and AddressSanitizer, these catch what a plain run cannot.
+#include <oecore/core/ref.h>
+#include <oecore/core/string.h>
+
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <barrier>
+#include <set>
+#include <thread>
+#include <vector>
+
+#include "testobjects.h"
+
+namespace {
+
+constexpr int rounds = 2000;
+
+// Runs body(i) on n threads released at the same moment.
+template <class Body>
+void together(int n, Body body) {
+    std::barrier start(n);
+    std::vector<std::thread> threads;
+    for (int i = 0; i < n; ++i)
+        threads.emplace_back([&, i] {
+            start.arrive_and_wait();
+            body(i);
+        });
+    for (std::thread& t : threads) t.join();
+}
+
+}  // namespace
+
+TEST(Concurrency, TwoFirstWeakReferencesShareOneRecord) {
+    for (int round = 0; round < rounds; ++round) {
+        OmbRef<TestNode> object(new TestNode);
+        OmbWRef<TestNode> weak[2];
+        together(2, [&](int i) { weak[i] = OmbWRef<TestNode>(object); });
+        ASSERT_EQ(weak[0].data(), weak[1].data());
+        ASSERT_EQ(weak[0].data()->refCount(), 3);  // the object's own hold and two callers
+    }
+}
+
+TEST(Concurrency, PromotionRacingTheFinalReleaseNeverSeesADeadObject) {
+    const int before = TestNode::alive;
+    int promoted = 0;
+    for (int round = 0; round < rounds; ++round) {
+        auto* raw = new TestNode;
+        OmbRef<TestNode> last(raw);
+        OmbWRef<TestNode> weak(last);
+        OmbRef<TestNode> got;
+        together(2, [&](int i) {
+            if (i == 0)
+                last.reset();
+            else
+                got = weak.strong();
+        });
+        if (got) {
+            ++promoted;
+            ASSERT_EQ(got.get(), raw);
+            ASSERT_EQ(got->refCount(), 1);
+            ASSERT_EQ(TestNode::alive, before + 1);
+            got.reset();
+        }
+        ASSERT_FALSE(weak.strong());
+        ASSERT_EQ(TestNode::alive, before);
+    }
+    RecordProperty("promoted", promoted);
+}
+
+TEST(Concurrency, RefsCopiedAndReleasedOnManyThreads) {
+    const int before = TestNode::alive;
+    OmbRef<TestNode> shared(new TestNode);
+    OmbWRef<TestNode> weak(shared);
+    together(4, [&](int) {
+        for (int i = 0; i < 20000; ++i) {
+            OmbRef<TestNode> copy = shared;
+            OmbRef<TestNode> again = weak.strong();
+            ASSERT_TRUE(again);
+        }
+    });
+    EXPECT_EQ(shared->refCount(), 1);
+    shared.reset();
+    EXPECT_EQ(TestNode::alive, before);
+}
+
+TEST(Concurrency, StringCopiesAndReleasesOnManyThreads) {
+    OmbString original("a string shared by every thread");
+    together(4, [&](int t) {
+        std::vector<OmbString> copies;
+        for (int i = 0; i < 20000; ++i) {
+            copies.push_back(original);
+            if (copies.size() > 16) copies.erase(copies.begin(), copies.begin() + 8 + t);
+        }
+        for (const OmbString& s : copies) ASSERT_EQ(s, original);
+    });
+    EXPECT_EQ(original, OmbString("a string shared by every thread"));
+}
+
+namespace {
+
+template <int N>
+struct Racer : OmbEngineObject {
+    Racer* clone() const override { return new Racer; }
+    static int classId() {
+        static int id = 0;
+        return initClassId(id);
+    }
+
+private:
+    int myClassId_() const override { return classId(); }
+    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }
+};
+
+template <int... N>
+std::vector<int> idsOf(std::integer_sequence<int, N...>) {
+    return {Racer<N>::classId()...};
+}
+
+}  // namespace
+
+TEST(Concurrency, ClassIdsStayUniqueWhenAskedFromManyThreads) {
+    std::vector<int> seen[4];
+    together(4, [&](int t) { seen[t] = idsOf(std::make_integer_sequence<int, 32>()); });
+    for (int t = 1; t < 4; ++t) EXPECT_EQ(seen[t], seen[0]);
+    EXPECT_EQ(std::set<int>(seen[0].begin(), seen[0].end()).size(), 32u);
+}

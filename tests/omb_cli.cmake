@@ -1,0 +1,15 @@
+# omb answers --help, --version and info, and rejects unknown commands.
+function(expect args rc pattern)
+  execute_process(COMMAND ${OMB} ${args} RESULT_VARIABLE got OUTPUT_VARIABLE out ERROR_VARIABLE err)
+  if(NOT got EQUAL rc)
+    message(FATAL_ERROR "omb ${args}: exit ${got}, expected ${rc}\n${out}${err}")
+  endif()
+  if(NOT "${out}${err}" MATCHES "${pattern}")
+    message(FATAL_ERROR "omb ${args}: output does not match '${pattern}':\n${out}${err}")
+  endif()
+endfunction()
+
+expect("--help" 0 "Usage: omb")
+expect("--version" 0 "omb 5\\.4\\.0\\.3")
+expect("info" 0 "ChildObjectEnumerator : EngineObjectEnumerator")
+expect("frobnicate" 2 "unknown command 'frobnicate'")
