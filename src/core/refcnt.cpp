@@ -12,10 +12,6 @@ std::mutex& weakReferenceMutex() {
 
 }  // namespace
 
-void OmbRefCnt::unref() const noexcept {
-    if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) trydel();
-}
-
 void OmbRefCnt::trydel() const noexcept { delete this; }
 
 void OmbWRefData::unref() noexcept {

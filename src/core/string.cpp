@@ -1,5 +1,6 @@
 #include <oecore/core/exception.h>
 #include <oecore/core/string.h>
+#include <oecore/core/stringblock.h>
 
 #include <locale.h>
 #include <atomic>
@@ -10,7 +11,6 @@
 #include <ostream>
 
 #include "codepage.h"
-#include "stringblock.h"
 #include "utf.h"
 
 using oecore::detail::StringBlock;
@@ -79,28 +79,11 @@ OmbString mapCase(const OmbString& s, Map map, MapL mapL) {
 
 OmbString::OmbString(StringBlock* block) noexcept : block_(block), text_(block ? block->bytes() : nullptr) {}
 
-OmbString::OmbString(const OmbString& other) noexcept : block_(other.block_), text_(other.text_) {
-    if (block_) block_->ref();
-}
-
-OmbString::OmbString(OmbString&& other) noexcept : block_(other.block_), text_(other.text_) {
-    other.block_ = nullptr;
-    other.text_ = nullptr;
-}
-
 OmbString::OmbString(const char* utf8) { assignFromUtf8(utf8, -1); }
 
 OmbString::OmbString(const char* begin, const char* end) { assignFromUtf8(begin, end - begin); }
 
 OmbString::OmbString(std::string_view utf8) { assignFromUtf8(utf8.data(), static_cast<std::ptrdiff_t>(utf8.size())); }
-
-OmbString::~OmbString() { release(); }
-
-void OmbString::release() noexcept {
-    if (block_) block_->unref();
-    block_ = nullptr;
-    text_ = nullptr;
-}
 
 OmbString& OmbString::operator=(const OmbString& other) noexcept {
     if (block_ == other.block_) {
@@ -217,20 +200,6 @@ std::string OmbString::toActiveCPIgnoreErrors() const {
 std::string OmbString::toSpecificCP(int codePage) const {
     const std::string name = oecore::detail::codePageName(codePage);
     return toCharset(*this, name, name.c_str(), false);
-}
-
-std::size_t OmbString::size() const noexcept {
-    if (block_) return block_->length;
-    return text_ ? std::strlen(text_) : 0;
-}
-
-int OmbString::compare(const OmbString& other) const noexcept {
-    if (text_ == other.text_) return 0;
-    const std::size_t a = size();
-    const std::size_t b = other.size();
-    const int c = std::memcmp(dataUtf8(), other.dataUtf8(), a < b ? a : b);
-    if (c != 0) return c < 0 ? -1 : 1;
-    return a == b ? 0 : (a < b ? -1 : 1);
 }
 
 std::ptrdiff_t OmbString::find(const OmbString& s, std::ptrdiff_t from) const noexcept {

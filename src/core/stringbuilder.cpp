@@ -1,4 +1,5 @@
 #include <oecore/core/exception.h>
+#include <oecore/core/stringblock.h>
 #include <oecore/core/stringbuilder.h>
 
 #include <clocale>
@@ -6,7 +7,6 @@
 #include <cstdlib>
 #include <cstring>
 
-#include "stringblock.h"
 #include "utf.h"
 
 using oecore::detail::StringBlock;

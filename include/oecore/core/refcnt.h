@@ -19,7 +19,9 @@ public:
     virtual ~OmbRefCnt() = default;
 
     void ref() const noexcept { count_.fetch_add(1, std::memory_order_relaxed); }
-    void unref() const noexcept;
+    void unref() const noexcept {
+        if (count_.fetch_sub(1, std::memory_order_acq_rel) == 1) trydel();
+    }
     bool hasOnlyOneReferee() const noexcept { return count_.load(std::memory_order_acquire) == 1; }
     std::int32_t refCount() const noexcept { return count_.load(std::memory_order_acquire); }
 

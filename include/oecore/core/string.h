@@ -10,27 +10,32 @@
 // threads at the same time.
 #pragma once
 
+#include <oecore/core/stringblock.h>
+
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 #include <iosfwd>
 #include <string>
 #include <string_view>
 
 class OmbStringBuilder;
-namespace oecore::detail {
-struct StringBlock;
-}
 
 class OmbString {
 public:
     OmbString() noexcept = default;
-    OmbString(const OmbString& other) noexcept;
-    OmbString(OmbString&& other) noexcept;
+    OmbString(const OmbString& other) noexcept : block_(other.block_), text_(other.text_) {
+        if (block_) block_->ref();
+    }
+    OmbString(OmbString&& other) noexcept : block_(other.block_), text_(other.text_) {
+        other.block_ = nullptr;
+        other.text_ = nullptr;
+    }
     // Copies the bytes (taken as UTF-8); null gives the empty string.
     OmbString(const char* utf8);
     OmbString(const char* begin, const char* end);
     OmbString(std::string_view utf8);
-    ~OmbString();
+    ~OmbString() { release(); }
 
     OmbString& operator=(const OmbString& other) noexcept;
     OmbString& operator=(OmbString&& other) noexcept;
@@ -62,7 +67,10 @@ public:
     operator std::string() const { return std::string(dataUtf8(), size()); }
     std::string_view view() const noexcept { return {dataUtf8(), size()}; }
 
-    std::size_t size() const noexcept;
+    std::size_t size() const noexcept {
+        if (block_) return block_->length;
+        return text_ ? std::strlen(text_) : 0;
+    }
     bool empty() const noexcept { return size() == 0; }
 
     // Byte positions; -1 when not found.
@@ -100,8 +108,19 @@ private:
     using Block = oecore::detail::StringBlock;
 
     explicit OmbString(Block* block) noexcept;
-    int compare(const OmbString& other) const noexcept;
-    void release() noexcept;
+    int compare(const OmbString& other) const noexcept {
+        if (text_ == other.text_) return 0;
+        const std::size_t a = size();
+        const std::size_t b = other.size();
+        const int c = std::memcmp(dataUtf8(), other.dataUtf8(), a < b ? a : b);
+        if (c != 0) return c < 0 ? -1 : 1;
+        return a == b ? 0 : (a < b ? -1 : 1);
+    }
+    void release() noexcept {
+        if (block_) block_->unref();
+        block_ = nullptr;
+        text_ = nullptr;
+    }
 
     Block* block_ = nullptr;
     const char* text_ = nullptr;

@@ -1,5 +1,6 @@
 // The heap block shared by OmbString values and filled by OmbStringBuilder:
-// a 32-bit length, a 32-bit atomic count, the bytes and a zero byte.
+// a 32-bit length, a 32-bit atomic count, the bytes and a zero byte. Public
+// only so that copying a string and asking its size stay inline.
 #pragma once
 
 #include <atomic>
