@@ -35,45 +35,20 @@ OmbRef<OmbRefCnt> AbstractClassMetaData::createInstance(OmbXmlParserContext&, Ti
     OMB_THROW(XmlAbstractClass, name());
 }
 
-IntMetaData& IntMetaData::instance() {
-    static IntMetaData metaData;
-    return metaData;
-}
-
 OmbRef<OmbRefCnt> IntMetaData::createInstance(OmbXmlParserContext&, TiXmlElement* element) {
     return parseBoxed<long long>(*this, element, [](const OmbString& t, long long& v) { return parseInt(t, v); });
-}
-
-DoubleMetaData& DoubleMetaData::instance() {
-    static DoubleMetaData metaData;
-    return metaData;
 }
 
 OmbRef<OmbRefCnt> DoubleMetaData::createInstance(OmbXmlParserContext&, TiXmlElement* element) {
     return parseBoxed<double>(*this, element, [](const OmbString& t, double& v) { return parseDouble(t, v); });
 }
 
-BoolMetaData& BoolMetaData::instance() {
-    static BoolMetaData metaData;
-    return metaData;
-}
-
 OmbRef<OmbRefCnt> BoolMetaData::createInstance(OmbXmlParserContext&, TiXmlElement* element) {
     return parseBoxed<bool>(*this, element, [](const OmbString& t, bool& v) { return parseBool(t, v); });
 }
 
-StringMetaData& StringMetaData::instance() {
-    static StringMetaData metaData;
-    return metaData;
-}
-
 OmbRef<OmbRefCnt> StringMetaData::createInstance(OmbXmlParserContext&, TiXmlElement* element) {
     return OmbBoxedValue<OmbString>::box(elementText(element));
-}
-
-CommentMetaData& CommentMetaData::instance() {
-    static CommentMetaData metaData;
-    return metaData;
 }
 
 OmbRef<OmbRefCnt> CommentMetaData::createInstance(OmbXmlParserContext&, TiXmlElement*) { return OmbRef<OmbRefCnt>(); }

@@ -202,30 +202,37 @@ std::string OmbString::toSpecificCP(int codePage) const {
     return toCharset(*this, name, name.c_str(), false);
 }
 
+namespace {
+
+// Between string_view's unsigned positions and ours, where -1 is "none" (or,
+// as a start, "from the end").
+std::ptrdiff_t position(std::size_t pos) {
+    return pos == std::string_view::npos ? -1 : static_cast<std::ptrdiff_t>(pos);
+}
+std::size_t startFromEnd(std::ptrdiff_t from) {
+    return from < 0 ? std::string_view::npos : static_cast<std::size_t>(from);
+}
+
+}  // namespace
+
 std::ptrdiff_t OmbString::find(const OmbString& s, std::ptrdiff_t from) const noexcept {
     if (empty() || s.empty() || from < 0) return -1;
-    const std::size_t pos = view().find(s.view(), static_cast<std::size_t>(from));
-    return pos == std::string_view::npos ? -1 : static_cast<std::ptrdiff_t>(pos);
+    return position(view().find(s.view(), static_cast<std::size_t>(from)));
 }
 
 std::ptrdiff_t OmbString::findLast(const OmbString& s, std::ptrdiff_t from) const noexcept {
     if (empty() || s.empty()) return -1;
-    const std::size_t start = from < 0 ? std::string_view::npos : static_cast<std::size_t>(from);
-    const std::size_t pos = view().rfind(s.view(), start);
-    return pos == std::string_view::npos ? -1 : static_cast<std::ptrdiff_t>(pos);
+    return position(view().rfind(s.view(), startFromEnd(from)));
 }
 
 std::ptrdiff_t OmbString::findFirstOf(const OmbString& list, std::ptrdiff_t from) const noexcept {
     if (empty() || list.empty() || from < 0) return -1;
-    const std::size_t pos = view().find_first_of(list.view(), static_cast<std::size_t>(from));
-    return pos == std::string_view::npos ? -1 : static_cast<std::ptrdiff_t>(pos);
+    return position(view().find_first_of(list.view(), static_cast<std::size_t>(from)));
 }
 
 std::ptrdiff_t OmbString::findLastOf(const OmbString& list, std::ptrdiff_t from) const noexcept {
     if (empty() || list.empty()) return -1;
-    const std::size_t start = from < 0 ? std::string_view::npos : static_cast<std::size_t>(from);
-    const std::size_t pos = view().find_last_of(list.view(), start);
-    return pos == std::string_view::npos ? -1 : static_cast<std::ptrdiff_t>(pos);
+    return position(view().find_last_of(list.view(), startFromEnd(from)));
 }
 
 bool OmbString::startsWith(const OmbString& s) const noexcept { return view().starts_with(s.view()); }

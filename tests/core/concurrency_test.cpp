@@ -102,15 +102,10 @@ namespace {
 
 template <int N>
 struct Racer : OmbEngineObject {
-    Racer* clone() const override { return new Racer; }
-    static int classId() {
-        static int id = 0;
-        return initClassId(id);
-    }
+    OMB_ENGINE_CLASS_INLINE(OmbEngineObject, "Racer", 0)
 
-private:
-    int myClassId_() const override { return classId(); }
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }
+public:
+    Racer* clone() const override { return new Racer; }
 };
 
 template <int... N>

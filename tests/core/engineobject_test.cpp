@@ -21,15 +21,10 @@ OmbRef<TestNode> node(const char* name, std::vector<OmbRef<TestNode>> children =
 
 template <int>
 struct Fresh : OmbEngineObject {
-    Fresh* clone() const override { return new Fresh; }
-    static int classId() {
-        static int id = 0;
-        return initClassId(id);
-    }
+    OMB_ENGINE_CLASS_INLINE(OmbEngineObject, "Fresh", 0)
 
-private:
-    int myClassId_() const override { return classId(); }
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }
+public:
+    Fresh* clone() const override { return new Fresh; }
 };
 
 }  // namespace

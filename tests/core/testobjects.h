@@ -10,6 +10,8 @@
 
 // Counts its live instances; refers to any number of children.
 class TestNode : public OmbResourceObject {
+    OMB_ENGINE_CLASS_INLINE(OmbResourceObject, "TestNode", 9)
+
 public:
     static inline std::atomic<int> alive{0};
 
@@ -34,43 +36,18 @@ public:
     }
     void releaseOwnership() { owned = false; }
 
-    static int classId() {
-        static int id = 0;
-        return initClassId(id);
-    }
-    static OmbClass* runtimeClass() {
-        static OmbClass record(OmbResourceObject::runtimeClass(), 9, "TestNode");
-        return &record;
-    }
-    const char* myRuntimeClassName() const override { return "TestNode"; }
-
     std::vector<OmbRef<TestNode>> children;
     int changes = 0;
     bool owned = false;
     int ownershipArgument = -1;
-
-private:
-    int myClassId_() const override { return classId(); }
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }
 };
 
 // A class that refuses to be cloned.
 class Unclonable : public OmbEngineObject {
+    OMB_ENGINE_CLASS_INLINE(OmbEngineObject, "Unclonable", 0)
+
 public:
     OmbEngineObject* clone() const override;
-    static int classId() {
-        static int id = 0;
-        return initClassId(id);
-    }
-    static OmbClass* runtimeClass() {
-        static OmbClass record(OmbEngineObject::runtimeClass(), 0, "Unclonable");
-        return &record;
-    }
-    const char* myRuntimeClassName() const override { return "Unclonable"; }
-
-private:
-    int myClassId_() const override { return classId(); }
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }
 };
 
 inline OmbEngineObject* Unclonable::clone() const {

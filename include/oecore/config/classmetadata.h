@@ -62,50 +62,34 @@ private:
 // The built-in value types. Each converts an element's text to a boxed value
 // (OmbBoxedValue<long long>, <double>, <bool> or <OmbString>); a comment
 // yields an empty reference. One shared instance each.
-class IntMetaData : public ConcreteClassMetaData {
+template <class Self>
+class OmbBuiltInValueMetaData : public ConcreteClassMetaData {
 public:
-    static IntMetaData& instance();
-    OmbRef<OmbRefCnt> createInstance(OmbXmlParserContext& context, TiXmlElement* element) override;
+    static Self& instance() {
+        static Self metaData;
+        return metaData;
+    }
 
-private:
-    IntMetaData() : ConcreteClassMetaData(OmbString::literal("int"), true) {}
+protected:
+    explicit OmbBuiltInValueMetaData(const char* name) : ConcreteClassMetaData(OmbString::literal(name), true) {}
 };
 
-class DoubleMetaData : public ConcreteClassMetaData {
-public:
-    static DoubleMetaData& instance();
-    OmbRef<OmbRefCnt> createInstance(OmbXmlParserContext& context, TiXmlElement* element) override;
+#define OMB_BUILT_IN_VALUE_METADATA(CLASS, NAME)                                                        \
+    class CLASS : public OmbBuiltInValueMetaData<CLASS> {                                               \
+    public:                                                                                             \
+        OmbRef<OmbRefCnt> createInstance(OmbXmlParserContext& context, TiXmlElement* element) override; \
+                                                                                                        \
+    private:                                                                                            \
+        friend class OmbBuiltInValueMetaData<CLASS>;                                                    \
+        CLASS() : OmbBuiltInValueMetaData(NAME) {}                                                      \
+    };
 
-private:
-    DoubleMetaData() : ConcreteClassMetaData(OmbString::literal("double"), true) {}
-};
-
-class BoolMetaData : public ConcreteClassMetaData {
-public:
-    static BoolMetaData& instance();
-    OmbRef<OmbRefCnt> createInstance(OmbXmlParserContext& context, TiXmlElement* element) override;
-
-private:
-    BoolMetaData() : ConcreteClassMetaData(OmbString::literal("bool"), true) {}
-};
-
-class StringMetaData : public ConcreteClassMetaData {
-public:
-    static StringMetaData& instance();
-    OmbRef<OmbRefCnt> createInstance(OmbXmlParserContext& context, TiXmlElement* element) override;
-
-private:
-    StringMetaData() : ConcreteClassMetaData(OmbString::literal("String"), true) {}
-};
-
-class CommentMetaData : public ConcreteClassMetaData {
-public:
-    static CommentMetaData& instance();
-    OmbRef<OmbRefCnt> createInstance(OmbXmlParserContext& context, TiXmlElement* element) override;
-
-private:
-    CommentMetaData() : ConcreteClassMetaData(OmbString::literal("Comment"), true) {}
-};
+OMB_BUILT_IN_VALUE_METADATA(IntMetaData, "int")
+OMB_BUILT_IN_VALUE_METADATA(DoubleMetaData, "double")
+OMB_BUILT_IN_VALUE_METADATA(BoolMetaData, "bool")
+OMB_BUILT_IN_VALUE_METADATA(StringMetaData, "String")
+OMB_BUILT_IN_VALUE_METADATA(CommentMetaData, "Comment")
+#undef OMB_BUILT_IN_VALUE_METADATA
 
 // Generated-style metadata of the OmbChildObjectMode enumeration: value
 // names "TopLevel" and "AllLevels".

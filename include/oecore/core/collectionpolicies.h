@@ -56,13 +56,9 @@ private:
     std::atomic<int> owned_{0};
 };
 
-// No ownership and no read-only enforcement.
-class OmbVecSharingDummy {
+// Item hooks of the policies under which items are not owned.
+class OmbItemsNotOwned {
 public:
-    static constexpr bool enforced = false;
-    bool takeFlag() noexcept { return true; }
-    void clearFlag() noexcept {}
-    bool isOwned() const noexcept { return false; }
     void argument(int) noexcept {}
     template <class Item>
     bool adoptItem(const Item&) noexcept {
@@ -72,17 +68,19 @@ public:
     void disownItem(const Item&) noexcept {}
 };
 
+// No ownership and no read-only enforcement.
+class OmbVecSharingDummy : public OmbItemsNotOwned {
+public:
+    static constexpr bool enforced = false;
+    bool takeFlag() noexcept { return true; }
+    void clearFlag() noexcept {}
+    bool isOwned() const noexcept { return false; }
+};
+
 // The collection itself can be owned by one object.
-class OmbVecSharing : public OmbOwnedFlag {
+class OmbVecSharing : public OmbOwnedFlag, public OmbItemsNotOwned {
 public:
     static constexpr bool enforced = true;
-    void argument(int) noexcept {}
-    template <class Item>
-    bool adoptItem(const Item&) noexcept {
-        return true;
-    }
-    template <class Item>
-    void disownItem(const Item&) noexcept {}
 };
 
 template <class T>

@@ -63,6 +63,26 @@ public:
     const char* CLASS::myRuntimeClassName() const { return ELEMENT; }  \
     [[maybe_unused]] static const OmbClass* const CLASS##RuntimeClassAtLoad = CLASS::runtimeClass();
 
+// The same members defined in the class body, for templates and classes that
+// live in one header.
+#define OMB_ENGINE_CLASS_INLINE(BASE, ELEMENT, PLUGIN)                    \
+public:                                                                   \
+    static int classId() {                                                \
+        static int id = 0;                                                \
+        return OmbEngineObject::initClassId(id);                          \
+    }                                                                     \
+    static OmbClass* runtimeClass() {                                     \
+        static OmbClass record(BASE::runtimeClass(), PLUGIN, ELEMENT);    \
+        return &record;                                                   \
+    }                                                                     \
+    const char* myRuntimeClassName() const override { return ELEMENT; }   \
+                                                                          \
+private:                                                                  \
+    int myClassId_() const override { return classId(); }                 \
+    OmbClass* myRuntimeClass_() const override { return runtimeClass(); } \
+                                                                          \
+public:
+
 class OmbEngineObject : public OmbWRefCnt {
 public:
     OmbEngineObject() = default;

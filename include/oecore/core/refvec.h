@@ -9,6 +9,9 @@
 
 template <class T, int N = 0, class Notifier = OmbRefVecNotifierDummy, class Sharing = OmbRefVecSharingDummy<T>>
 class OmbRefVec : public OmbCollection<OmbRef<T>, std::vector<OmbRef<T>>, Notifier, Sharing> {
+    // Collections have no element of their own: they are written inline.
+    OMB_ENGINE_CLASS_INLINE(OmbEngineObject, "", 0)
+
 public:
     OmbRefVec() = default;
 
@@ -36,18 +39,4 @@ public:
         }
         return children;
     }
-
-    static int classId() {
-        static int id = 0;
-        return OmbEngineObject::initClassId(id);
-    }
-    static OmbClass* runtimeClass() {
-        static OmbClass record(OmbEngineObject::runtimeClass(), 0, "");
-        return &record;
-    }
-    const char* myRuntimeClassName() const override { return ""; }
-
-private:
-    int myClassId_() const override { return classId(); }
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }
 };

@@ -8,6 +8,9 @@
 template <class T, int N = 0, class Notifier = OmbVecNotifierDummy, class Container = std::vector<T>,
           class Sharing = OmbVecSharingDummy>
 class OmbVec : public OmbCollection<T, Container, Notifier, Sharing> {
+    // Collections have no element of their own: they are written inline.
+    OMB_ENGINE_CLASS_INLINE(OmbEngineObject, "", 0)
+
 public:
     OmbVec() = default;
     OmbVec(std::initializer_list<T> values) {
@@ -18,18 +21,4 @@ public:
     OmbVec* clone() const override { return new OmbVec(*this); }
     // A new collection with the same values.
     OmbRef<OmbVec> shallowCopy() const { return OmbRef<OmbVec>(clone()); }
-
-    static int classId() {
-        static int id = 0;
-        return OmbEngineObject::initClassId(id);
-    }
-    static OmbClass* runtimeClass() {
-        static OmbClass record(OmbEngineObject::runtimeClass(), 0, "");
-        return &record;
-    }
-    const char* myRuntimeClassName() const override { return ""; }
-
-private:
-    int myClassId_() const override { return classId(); }
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }
 };
