@@ -107,11 +107,3 @@ TEST(ValueParsers, NumbersIgnoreTheProcessLocale) {
     EXPECT_FALSE(parseInt(OmbString("99999999999999999999"), i));
     EXPECT_FALSE(parseInt(OmbString("+-1"), i));
 }
-
-TEST(ChildObjectModeMetaData, ValueNames) {
-    int value = -1;
-    EXPECT_TRUE(ChildObjectModeMetaData::fromString(OmbString("AllLevels"), value));
-    EXPECT_EQ(value, static_cast<int>(OmbChildObjectMode::AllLevels));
-    EXPECT_FALSE(ChildObjectModeMetaData::fromString(OmbString("alllevels"), value));
-    EXPECT_EQ(ChildObjectModeMetaData::toString(static_cast<int>(OmbChildObjectMode::TopLevel)), OmbString("TopLevel"));
-}

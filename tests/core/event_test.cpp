@@ -44,13 +44,3 @@ TEST(Event, AThrowingHandlerStopsTheRestAndNeverEscapes) {
     EXPECT_TRUE(calls.empty());
     Sender::errorEvent = {};
 }
-
-TEST(EventArgs, EqualityFollowsTheirFields) {
-    EXPECT_EQ(OmbNoEventArgs{}, OmbNoEventArgs{});
-    EXPECT_EQ((OmbLogEventArgs{OmbLogError, OmbString("m")}), (OmbLogEventArgs{OmbLogDebug, OmbString("m")}));
-    const OmbGlobalStatusEventArgs status{7, OmbString("loading"), 40, false};
-    EXPECT_TRUE(status.isPercentCompleteValid());
-    EXPECT_FALSE((OmbGlobalStatusEventArgs{7, OmbString("loading"), -1, false}).isPercentCompleteValid());
-    EXPECT_EQ(status, (OmbGlobalStatusEventArgs{7, OmbString("loading"), 40, false}));
-    EXPECT_NE(status, (OmbGlobalStatusEventArgs{7, OmbString("loading"), 40, true}));
-}
