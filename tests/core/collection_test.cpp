@@ -41,6 +41,26 @@ TEST(Vec, EditsKeepOrder) {
     EXPECT_FALSE(copy->equals(*v));
 }
 
+TEST(Vec, IndicesOfChangesAreCheckedAndNothingChangesOnError) {
+    OmbRef<IntVec> v(new IntVec{1, 2, 3});
+    EXPECT_THROW(v->set(3, 0), OmbXRangeError);
+    EXPECT_THROW(v->insert(4, 0), OmbXRangeError);
+    EXPECT_THROW(v->erase(2, 2), OmbXRangeError);
+    EXPECT_THROW(v->erase(1, static_cast<std::size_t>(-1)), OmbXRangeError);
+    try {
+        v->removeAt(7);
+        FAIL();
+    } catch (const OmbXRangeError& e) {
+        EXPECT_EQ(e.asString(), OmbString("Value \"7\" is out of range in collection erase, should be below 4."));
+    }
+    EXPECT_EQ(values(*v), (std::vector<int>{1, 2, 3}));
+    v->insert(3, 4);  // at the end is allowed
+    v->erase(4, 0);
+    OmbRef<IntVec> empty(new IntVec);
+    EXPECT_THROW(empty->pop(), OmbXRangeError);
+    EXPECT_THROW(empty->pop_back(), OmbXRangeError);
+}
+
 TEST(Vec, MemoryPressureFollowsCapacity) {
     OmbRef<IntVec> v(new IntVec);
     EXPECT_EQ(v->memoryPressure(), 4000u);

@@ -44,6 +44,20 @@ TEST(RefCnt, ReleaseDestroysExactlyOnceAndWeakSurvivesAsNull) {
     EXPECT_EQ(weak.data()->refCount(), 2);
 }
 
+// The moment between the final release's decrement and its deletion: the
+// count is zero. A promotion then must fail; one that succeeded would let
+// its own release delete the object while the first release still runs.
+TEST(RefCnt, PromotionOfAnObjectWhoseCountReachedZeroFails) {
+    const int before = TestNode::alive;
+    auto* condemned = new TestNode;
+    OmbWRef<TestNode> weak(condemned);
+    EXPECT_FALSE(weak.strong());
+    EXPECT_EQ(TestNode::alive, before + 1);
+    EXPECT_EQ(condemned->refCount(), 0);
+    delete condemned;
+    EXPECT_FALSE(weak.strong());
+}
+
 TEST(RefCnt, SelfAssignmentAndReassignmentKeepCountsRight) {
     OmbRef<TestNode> a(new TestNode);
     OmbRef<TestNode>& alias = a;

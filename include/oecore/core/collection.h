@@ -4,7 +4,8 @@
 // read-only mark, a notifier that reports changes to an owning object and a
 // sharing policy. With a sharing policy every change first checks the
 // read-only mark; without one the mark is only recorded. get() does not
-// check its index: callers keep indices below size().
+// check its index (callers keep indices below size()); the operations that
+// change the collection do, and throw OmbXRangeError.
 #pragma once
 
 #include <oecore/core/collectionpolicies.h>
@@ -14,6 +15,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <functional>
+#include <string>
 #include <vector>
 
 template <class Item, class Container, class Notifier, class Sharing>
@@ -44,6 +46,7 @@ public:
 
     void set(std::size_t index, const Item& item) {
         checkWritable();
+        checkBelow(index, items_.size(), "collection set");
         if (items_[index] == item) return;
         adopt(item);
         Item old = items_[index];
@@ -55,6 +58,7 @@ public:
     void push_back(const Item& item) { insert(items_.size(), item); }
     void insert(std::size_t index, const Item& item) {
         checkWritable();
+        checkBelow(index, items_.size() + 1, "collection insert");
         items_.reserve(items_.size() + 1);
         adopt(item);
         items_.insert(items_.begin() + static_cast<std::ptrdiff_t>(index), item);
@@ -63,6 +67,7 @@ public:
     void addRange(const OmbCollection& other) { insertRange(items_.size(), other); }
     void insertRange(std::size_t index, const OmbCollection& other) {
         checkWritable();
+        checkBelow(index, items_.size() + 1, "collection insertRange");
         const Container added = other.items_;  // other may be this collection
         items_.reserve(items_.size() + added.size());
         adoptAll(added);
@@ -88,6 +93,8 @@ public:
     }
     void erase(std::size_t index, std::size_t count = 1) {
         checkWritable();
+        checkBelow(index, items_.size() + 1, "collection erase");
+        checkBelow(count, items_.size() - index + 1, "collection erase count");
         const auto first = items_.begin() + static_cast<std::ptrdiff_t>(index);
         const auto last = first + static_cast<std::ptrdiff_t>(count);
         const Container removed(first, last);
@@ -104,11 +111,15 @@ public:
         return true;
     }
     Item pop() {
+        checkBelow(0, items_.size(), "collection pop");
         Item last = items_.back();
         pop_back();
         return last;
     }
-    void pop_back() { erase(items_.size() - 1); }
+    void pop_back() {
+        checkBelow(0, items_.size(), "collection pop_back");
+        erase(items_.size() - 1);
+    }
 
     void reserve(std::size_t n) { items_.reserve(n); }
     void resize(std::size_t n) {
@@ -167,6 +178,11 @@ private:
         if constexpr (Sharing::enforced) {
             if (readOnly_) OMB_THROW(ReadOnly, OmbString::literal("Collection"));
         }
+    }
+    void checkBelow(std::size_t value, std::size_t bound, const char* operation) const {
+        if (value < bound) return;
+        OMB_THROW(RangeError, OmbString(std::to_string(value)), OmbString(operation),
+                  OmbString("below " + std::to_string(bound)));
     }
     void adopt(const Item& item) {
         if (!sharing_.adoptItem(item)) OMB_THROW(SharingViolation, OmbString::literal("item"));
