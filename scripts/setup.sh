@@ -7,6 +7,7 @@ packages=(
   build-essential cmake ninja-build ccache pkg-config git
   clang-format
   libtinyxml-dev
+  libtbb-dev
   googletest libgtest-dev libbenchmark-dev
 )
 

@@ -3,7 +3,9 @@
 
 #include <oecore/version.h>
 
+#include <oecore/core/abort.h>
 #include <oecore/core/cachable.h>
+#include <oecore/core/cache.h>
 #include <oecore/core/cacheref.h>
 #include <oecore/core/class.h>
 #include <oecore/core/collection.h>
@@ -12,14 +14,23 @@
 #include <oecore/core/enumerator.h>
 #include <oecore/core/event.h>
 #include <oecore/core/exception.h>
+#include <oecore/core/globalcache.h>
+#include <oecore/core/globalstatus.h>
+#include <oecore/core/log.h>
 #include <oecore/core/loglevel.h>
+#include <oecore/core/readerwriterlock.h>
 #include <oecore/core/ref.h>
 #include <oecore/core/refcnt.h>
 #include <oecore/core/refvec.h>
 #include <oecore/core/resourceobject.h>
+#include <oecore/core/runtime.h>
+#include <oecore/core/screen.h>
+#include <oecore/core/settingsfile.h>
 #include <oecore/core/string.h>
+#include <oecore/core/stringblock.h>
 #include <oecore/core/stringbuilder.h>
 #include <oecore/core/stringutils.h>
+#include <oecore/core/threadid.h>
 #include <oecore/core/unicodeutils.h>
 #include <oecore/core/vec.h>
 

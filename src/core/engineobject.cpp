@@ -1,11 +1,10 @@
 #include <oecore/core/engineobject.h>
 #include <oecore/core/enumerator.h>
 #include <oecore/core/refvec.h>
+#include <oecore/core/runtime.h>
 
 #include <atomic>
 #include <mutex>
-
-#include "configurationscope.h"
 
 namespace {
 
@@ -57,17 +56,17 @@ bool OmbEngineObject::nameEquals(const OmbString&) const { return false; }
 OmbString OmbEngineObject::saveComment() const { return OmbString(); }
 
 OmbRef<OmbEngineObject> OmbEngineObject::safeClone() const {
-    oecore::detail::ConfigurationReadScope scope;
+    OmbReuseWriterOrAcquireRecursiveReaderLock scope(OmbRuntime::configurationLock());
     return OmbRef<OmbEngineObject>(clone());
 }
 
 OmbRef<OmbEngineObjectVec> OmbEngineObject::getChildObjects(OmbChildObjectMode mode) const {
-    oecore::detail::ConfigurationReadScope scope;
+    OmbReuseWriterOrAcquireRecursiveReaderLock scope(OmbRuntime::configurationLock());
     return collectChildren(*this, mode);
 }
 
 OmbRef<OmbEngineObject> OmbEngineObject::findChildObject(const OmbString& name, OmbChildObjectMode mode) const {
-    oecore::detail::ConfigurationReadScope scope;
+    OmbReuseWriterOrAcquireRecursiveReaderLock scope(OmbRuntime::configurationLock());
     const OmbRef<OmbEngineObjectVec> children = collectChildren(*this, mode);
     for (const OmbRef<OmbEngineObject>& child : *children)
         if (child->nameEquals(name)) return child;

@@ -1,9 +1,9 @@
 #include <oecore/core/exception.h>
+#include <oecore/core/log.h>
 #include <oecore/core/stringbuilder.h>
 
 #include <cstring>
-
-#include "errorlog.h"
+#include <string>
 
 OmbException::OmbException(const char* file, int line, const OmbString& a1, const OmbString& a2, const OmbString& a3)
     : file_(file ? file : ""), line_(line), a1_(a1), a2_(a2), a3_(a3) {}
@@ -32,10 +32,9 @@ void OmbException::findReplace(OmbString& text, const OmbString& what, const Omb
 }
 
 void OmbException::logException() const {
-    if (!oecore::detail::errorLogActive()) return;
-    OmbStringBuilder line;
-    line << file_ << ", line " << line_ << ": " << asString() << ", " << id();
-    oecore::detail::writeErrorLog(line.str());
+    if (!OmbLog::isActive(OmbLogError)) return;
+    OmbLog::error(Omb_formatMessage("%1%, line %2%: %3%, %4%",
+                                    {OmbString(file_), OmbString(std::to_string(line_)), asString(), id()}));
 }
 
 OmbString getLastErrorAsString(int errorCode) {

@@ -115,7 +115,7 @@ public:
     bool gcIsCacheLeaf() override { return true; }
     bool gcEvictable() override { return evictable_; }
     bool gcEvictableNow() override { return true; }
-    OmbICachable* gcGet(std::uint64_t) override { return nullptr; }
+    OmbRef<OmbRefCnt> gcGet(std::uint64_t) override { return OmbRef<OmbRefCnt>(); }
     void gcAdd(std::uint64_t, OmbICachable*) override {}
     void gcRemove(std::uint64_t) override {}
     void gcEvict(std::uint64_t) override {}

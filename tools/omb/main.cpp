@@ -1,22 +1,29 @@
 // omb: the OECore command-line tool.
 #include <oecore/oecore.h>
 
+#include <clocale>
 #include <cstring>
 #include <iostream>
 #include <string>
+#include <vector>
 
 namespace {
 
 void printHelp(std::ostream& out) {
-    out << "Usage: omb <command> [options]\n"
+    out << "Usage: omb [options] <command>\n"
            "\n"
            "Commands:\n"
            "  info        print the library version and the registered engine classes\n"
            "  classes     list the registered engine classes with their class records\n"
            "\n"
            "Options:\n"
-           "  -h, --help     show this help and exit\n"
-           "  -V, --version  print the version and exit\n";
+           "  --log-file FILE    write the library's log to FILE (rotated at 10 MiB, 4 files)\n"
+           "  --log-level LEVEL  all, debug, info, warning, error, fatal or off (default: off,\n"
+           "                     or all when a log file is given)\n"
+           "  -h, --help         show this help and exit\n"
+           "  -V, --version      print the version and exit\n"
+           "\n"
+           "Settings are read from omb.ini beside the executable, as for any OECore application.\n";
 }
 
 void printClasses(std::ostream& out) {
@@ -31,36 +38,91 @@ void printClasses(std::ostream& out) {
     out << count << " engine classes\n";
 }
 
+struct Options {
+    std::string command;
+    std::string logFile;
+    std::string logLevel;
+};
+
+// Returns false, having said why, when the arguments do not parse.
+bool parse(int argc, char** argv, Options& options) {
+    for (int i = 1; i < argc; ++i) {
+        const std::string arg = argv[i];
+        const bool takesValue = arg == "--log-file" || arg == "--log-level";
+        if (takesValue && i + 1 >= argc) {
+            std::cerr << "omb: " << arg << " needs a value; see 'omb --help'\n";
+            return false;
+        }
+        if (arg == "--log-file")
+            options.logFile = argv[++i];
+        else if (arg == "--log-level")
+            options.logLevel = argv[++i];
+        else if (options.command.empty())
+            options.command = arg;
+        else {
+            std::cerr << "omb: unexpected argument '" << arg << "'; see 'omb --help'\n";
+            return false;
+        }
+    }
+    return true;
+}
+
+void startLog(const Options& options) {
+    if (!options.logFile.empty()) {
+        constexpr unsigned fileCount = 4;
+        constexpr unsigned maximumFileSize = 10485760;
+        OmbLog::addAppender(OmbRef<OmbLogAppender>(
+            new OmbRollingFileLogAppender(OmbString(options.logFile), fileCount, maximumFileSize)));
+        OmbLog::logLevel(OmbLogAll);
+    }
+    if (!options.logLevel.empty()) {
+        OmbLogLevel level;
+        if (!OmbLog::parseLevel(OmbString(options.logLevel), level))
+            OMB_THROW(IllegalArgument, OmbString("--log-level " + options.logLevel));
+        OmbLog::logLevel(level);
+    }
+}
+
+int run(const Options& options) {
+    if (options.command == "info") {
+        std::cout << "OECore " << OmbRuntime::version() << "\n";
+        printClasses(std::cout);
+        return 0;
+    }
+    if (options.command == "classes") {
+        printClasses(std::cout);
+        return 0;
+    }
+    std::cerr << "omb: unknown command '" << options.command << "'; see 'omb --help'\n";
+    return 2;
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
-    if (argc < 2) {
+    std::setlocale(LC_ALL, "");
+    Options options;
+    if (!parse(argc, argv, options)) return 2;
+    if (options.command.empty()) {
         printHelp(std::cerr);
         return 2;
     }
-    const std::string command = argv[1];
-    if (command == "-h" || command == "--help" || command == "help") {
+    if (options.command == "-h" || options.command == "--help" || options.command == "help") {
         printHelp(std::cout);
         return 0;
     }
-    if (command == "-V" || command == "--version") {
+    if (options.command == "-V" || options.command == "--version") {
         std::cout << "omb " << OECORE_VERSION_STRING << "\n";
         return 0;
     }
+    int status = 1;
     try {
-        if (command == "info") {
-            std::cout << "OECore " << OECORE_VERSION_STRING << "\n";
-            printClasses(std::cout);
-            return 0;
-        }
-        if (command == "classes") {
-            printClasses(std::cout);
-            return 0;
-        }
+        startLog(options);
+        OmbRuntime::init();
+        status = run(options);
     } catch (const OmbException& e) {
         std::cerr << "omb: " << e.asString() << "\n";
-        return 1;
     }
-    std::cerr << "omb: unknown command '" << command << "'; see 'omb --help'\n";
-    return 2;
+    OmbRuntime::shutdown();
+    return status;
 }

@@ -24,10 +24,12 @@ public:
     // objects alive until it evicts them and only watches the others.
     virtual bool gcEvictable() = 0;
     virtual bool gcEvictableNow() = 0;
-    // Child operations of cache nodes.
-    virtual OmbICachable* gcGet(std::uint64_t key) = 0;
+    // Child operations of cache nodes. gcGet returns the child's owner,
+    // stamped with the node's generation, or null.
+    virtual OmbRef<OmbRefCnt> gcGet(std::uint64_t key) = 0;
     virtual void gcAdd(std::uint64_t key, OmbICachable* child) = 0;
     virtual void gcRemove(std::uint64_t key) = 0;
+    // Evicts children last touched before the generation.
     virtual void gcEvict(std::uint64_t generation) = 0;
     virtual bool gcEmpty() = 0;
 };
