@@ -1,23 +1,14 @@
 // OmbRef, OmbWRef and OmbString against std::shared_ptr, std::weak_ptr and
 // std::string doing the same work. Each pair runs in one process; the
 // ratios (OECore time / standard library time) are printed at the end.
-//
-// The process starts a thread before measuring: libstdc++ switches
-// shared_ptr to plain, non-atomic counting while a process has only one
-// thread, which no process using OECore is (the cache collector runs from
-// start-up).
 #include <oecore/core/ref.h>
 #include <oecore/core/refcnt.h>
 #include <oecore/core/string.h>
 
-#include <benchmark/benchmark.h>
-
-#include <cstdio>
-#include <map>
 #include <memory>
 #include <string>
-#include <thread>
-#include <vector>
+
+#include "ratioreporter.h"
 
 namespace {
 
@@ -110,42 +101,13 @@ BENCHMARK(BM_StdString_Compare);
 BENCHMARK(BM_OmbString_Find);
 BENCHMARK(BM_StdString_Find);
 
-// Collects the time per iteration of every run to print the ratios.
-class RatioReporter : public benchmark::ConsoleReporter {
-public:
-    void ReportRuns(const std::vector<Run>& runs) override {
-        for (const Run& run : runs) times_[run.benchmark_name()] = run.GetAdjustedCPUTime();
-        ConsoleReporter::ReportRuns(runs);
-    }
-    void printRatios() const {
-        const std::pair<const char*, const char*> pairs[] = {
-            {"BM_OmbRef_CopyRelease", "BM_SharedPtr_CopyRelease"},
-            {"BM_OmbWRef_Promote", "BM_WeakPtr_Promote"},
-            {"BM_OmbString_Copy", "BM_StdString_Copy"},
-            {"BM_OmbString_Compare", "BM_StdString_Compare"},
-            {"BM_OmbString_Find", "BM_StdString_Find"},
-        };
-        std::printf("\nratio (OECore / standard library; below 1 is faster):\n");
-        for (const auto& [ours, theirs] : pairs) {
-            const auto a = times_.find(ours);
-            const auto b = times_.find(theirs);
-            if (a == times_.end() || b == times_.end() || b->second <= 0) continue;
-            std::printf("  %-24s / %-26s %6.2f\n", ours, theirs, a->second / b->second);
-        }
-    }
-
-private:
-    std::map<std::string, double> times_;
-};
-
 }  // namespace
 
 int main(int argc, char** argv) {
-    std::thread([] {}).join();
-    benchmark::Initialize(&argc, argv);
-    RatioReporter reporter;
-    benchmark::RunSpecifiedBenchmarks(&reporter);
-    reporter.printRatios();
-    benchmark::Shutdown();
-    return 0;
+    return runWithRatios(argc, argv,
+                         {{"BM_OmbRef_CopyRelease", "BM_SharedPtr_CopyRelease"},
+                          {"BM_OmbWRef_Promote", "BM_WeakPtr_Promote"},
+                          {"BM_OmbString_Copy", "BM_StdString_Copy"},
+                          {"BM_OmbString_Compare", "BM_StdString_Compare"},
+                          {"BM_OmbString_Find", "BM_StdString_Find"}});
 }

@@ -43,7 +43,8 @@ void OmbAbstractCacheNode::unfile(std::uint64_t key, std::uint64_t bucket) {
     if (it != buckets_.end()) it->second.erase(key);
 }
 
-void OmbAbstractCacheNode::erase(std::map<std::uint64_t, Entry>::iterator it, std::vector<OmbCacheRef>& released) {
+void OmbAbstractCacheNode::erase(std::unordered_map<std::uint64_t, Entry>::iterator it,
+                                 std::vector<OmbCacheRef>& released) {
     unfile(it->first, it->second.bucket);
     size_ -= it->second.size;
     released.push_back(std::move(it->second.ref));

@@ -6,11 +6,12 @@
 
 namespace {
 
-// Guards creation and destruction of the instance and retirement by
-// generations that may outlive it.
+// Publishes and withdraws the instance, and lets generations that outlive
+// their cache find out. Never held while another lock is taken, except the
+// cache's own mutex in retire().
 std::mutex instanceMutex;
 std::atomic<OmbGlobalCache*> current{nullptr};
-std::uint64_t lastEpoch = 0;
+std::atomic<std::uint64_t> lastEpoch{0};
 
 }  // namespace
 
@@ -22,9 +23,16 @@ OmbCacheGen::~OmbCacheGen() { OmbGlobalCache::retire(gen_, cacheEpoch_); }
 
 OmbGlobalCache& OmbGlobalCache::instance() {
     if (OmbGlobalCache* cache = current.load(std::memory_order_acquire)) return *cache;
-    std::lock_guard lock(instanceMutex);
-    if (!current.load(std::memory_order_relaxed)) current.store(new OmbGlobalCache(++lastEpoch));
-    return *current.load(std::memory_order_relaxed);
+    // Built outside the lock: building takes the new root's lock.
+    auto* fresh = new OmbGlobalCache(lastEpoch.fetch_add(1) + 1);
+    OmbGlobalCache* winner;
+    {
+        std::lock_guard lock(instanceMutex);
+        winner = current.load(std::memory_order_relaxed);
+        if (!winner) current.store(winner = fresh, std::memory_order_release);
+    }
+    if (winner != fresh) delete fresh;  // another thread was first
+    return *winner;
 }
 
 void OmbGlobalCache::destroy() {

@@ -4,21 +4,38 @@
 
 #include <tbb/spin_rw_mutex.h>
 
-#include <mutex>
-#include <unordered_map>
+#include <atomic>
+#include <vector>
 
 OMB_DEFINE_ENGINE_CLASS(OmbReaderWriterLock, OmbEngineObject, "ReaderWriterLock", 0)
 
 struct OmbReaderWriterLock::State {
     tbb::spin_rw_mutex lock;
-    // Who holds what, guarded by bookkeeping.
-    std::mutex bookkeeping;
-    std::uint32_t writer = 0;
+    // Written only by the thread that holds the write lock; others only
+    // compare it with their own id.
+    std::atomic<std::uint32_t> writer{0};
     int writeRecursion = 0;
-    std::unordered_map<std::uint32_t, int> readers;
 };
 
 namespace {
+
+// Each thread keeps its own read counts, so taking a read lock touches no
+// memory shared with other readers besides the spin lock itself.
+struct ReadCount {
+    const void* lock;
+    int count;
+};
+thread_local std::vector<ReadCount> readCounts;
+
+ReadCount* readCountOf(const void* lock) {
+    for (ReadCount& entry : readCounts)
+        if (entry.lock == lock) return &entry;
+    return nullptr;
+}
+
+void forgetReadCount(const void* lock) {
+    std::erase_if(readCounts, [lock](const ReadCount& entry) { return entry.lock == lock; });
+}
 
 [[noreturn]] void alreadyWriter() {
     OMB_THROW(InvalidOperation, OmbString::literal("The current thread already owns the writer lock."));
@@ -33,85 +50,56 @@ OmbReaderWriterLock::OmbReaderWriterLock() : state_(std::make_unique<State>()) {
 
 OmbReaderWriterLock::~OmbReaderWriterLock() = default;
 
+bool OmbReaderWriterLock::hasWriterLock() const {
+    return state_->writer.load(std::memory_order_relaxed) == Omb_currentThreadId();
+}
+
 void OmbReaderWriterLock::acquireReaderLock() {
-    const std::uint32_t self = Omb_currentThreadId();
-    {
-        std::lock_guard guard(state_->bookkeeping);
-        if (state_->writer == self) alreadyWriter();
-        if (state_->readers.count(self)) alreadyReader();
-    }
+    if (hasWriterLock()) alreadyWriter();
+    if (readCountOf(this)) alreadyReader();
     state_->lock.lock_shared();
-    std::lock_guard guard(state_->bookkeeping);
-    state_->readers[self] = 1;
+    readCounts.push_back({this, 1});
 }
 
 void OmbReaderWriterLock::acquireRecursiveReaderLock() {
-    const std::uint32_t self = Omb_currentThreadId();
-    {
-        std::lock_guard guard(state_->bookkeeping);
-        if (state_->writer == self) alreadyWriter();
-        const auto it = state_->readers.find(self);
-        if (it != state_->readers.end()) {
-            ++it->second;
-            return;
-        }
+    if (hasWriterLock()) alreadyWriter();
+    if (ReadCount* own = readCountOf(this)) {
+        ++own->count;
+        return;
     }
     state_->lock.lock_shared();
-    std::lock_guard guard(state_->bookkeeping);
-    state_->readers[self] = 1;
+    readCounts.push_back({this, 1});
 }
 
 void OmbReaderWriterLock::releaseReaderLock() {
-    const std::uint32_t self = Omb_currentThreadId();
-    {
-        std::lock_guard guard(state_->bookkeeping);
-        const auto it = state_->readers.find(self);
-        if (it == state_->readers.end())
-            OMB_THROW(InvalidOperation, OmbString::literal("The current thread does not own a reader lock."));
-        if (--it->second > 0) return;
-        state_->readers.erase(it);
-    }
+    ReadCount* own = readCountOf(this);
+    if (!own) OMB_THROW(InvalidOperation, OmbString::literal("The current thread does not own a reader lock."));
+    if (--own->count > 0) return;
+    forgetReadCount(this);
     state_->lock.unlock_shared();
 }
 
 void OmbReaderWriterLock::acquireWriterLock() {
-    const std::uint32_t self = Omb_currentThreadId();
-    {
-        std::lock_guard guard(state_->bookkeeping);
-        if (state_->writer == self) alreadyWriter();
-        if (state_->readers.count(self)) alreadyReader();
-    }
+    if (hasWriterLock()) alreadyWriter();
+    if (readCountOf(this)) alreadyReader();
     state_->lock.lock();
-    std::lock_guard guard(state_->bookkeeping);
-    state_->writer = self;
+    state_->writer.store(Omb_currentThreadId(), std::memory_order_relaxed);
     state_->writeRecursion = 1;
 }
 
 void OmbReaderWriterLock::acquireRecursiveWriterLock() {
-    {
-        std::lock_guard guard(state_->bookkeeping);
-        if (state_->writer == Omb_currentThreadId()) {
-            ++state_->writeRecursion;
-            return;
-        }
-    }
-    acquireWriterLock();
+    if (hasWriterLock())
+        ++state_->writeRecursion;
+    else
+        acquireWriterLock();
 }
 
 void OmbReaderWriterLock::releaseWriterLock() {
-    {
-        std::lock_guard guard(state_->bookkeeping);
-        if (state_->writer != Omb_currentThreadId())
-            OMB_THROW(InvalidOperation, OmbString::literal("The current thread does not own the writer lock."));
-        if (--state_->writeRecursion > 0) return;
-        state_->writer = 0;
-    }
+    if (!hasWriterLock())
+        OMB_THROW(InvalidOperation, OmbString::literal("The current thread does not own the writer lock."));
+    if (--state_->writeRecursion > 0) return;
+    state_->writer.store(0, std::memory_order_relaxed);
     state_->lock.unlock();
-}
-
-bool OmbReaderWriterLock::hasWriterLock() const {
-    std::lock_guard guard(state_->bookkeeping);
-    return state_->writer == Omb_currentThreadId();
 }
 
 OmbAcquireReaderLock::OmbAcquireReaderLock(OmbRef<OmbReaderWriterLock> lock) : lock_(std::move(lock)) { acquire(); }

@@ -1,6 +1,11 @@
-// Races on reference counts, weak records, strings and class ids. Run under
+// Races on reference counts, weak records, strings, class ids, the
+// configuration lock, abort requests and the cache collector. Run under
 // ThreadSanitizer and AddressSanitizer, these catch what a plain run cannot.
+#include <oecore/core/abort.h>
+#include <oecore/core/globalcache.h>
+#include <oecore/core/readerwriterlock.h>
 #include <oecore/core/ref.h>
+#include <oecore/core/runtime.h>
 #include <oecore/core/string.h>
 
 #include <gtest/gtest.h>
@@ -11,6 +16,7 @@
 #include <thread>
 #include <vector>
 
+#include "cachetestobjects.h"
 #include "testobjects.h"
 
 namespace {
@@ -120,4 +126,59 @@ TEST(Concurrency, ClassIdsStayUniqueWhenAskedFromManyThreads) {
     together(4, [&](int t) { seen[t] = idsOf(std::make_integer_sequence<int, 32>()); });
     for (int t = 1; t < 4; ++t) EXPECT_EQ(seen[t], seen[0]);
     EXPECT_EQ(std::set<int>(seen[0].begin(), seen[0].end()).size(), 32u);
+}
+
+TEST(Concurrency, WritersExcludeReadersAndEachOther) {
+    OmbRef<OmbReaderWriterLock> lock(new OmbReaderWriterLock);
+    long long a = 0;
+    long long b = 0;  // writers keep a == b
+    std::atomic<int> torn{0};
+    together(4, [&](int t) {
+        for (int i = 0; i < 2000; ++i) {
+            if (t % 2 == 0) {
+                OmbAcquireWriterLock writer(lock);
+                ++a;
+                ++b;
+            } else {
+                OmbReuseWriterOrAcquireRecursiveReaderLock reader(lock);
+                if (a != b) ++torn;
+            }
+        }
+    });
+    EXPECT_EQ(torn, 0);
+    EXPECT_EQ(a, 4000);
+}
+
+TEST(Concurrency, AGlobalAbortStopsExactlyOneThread) {
+    Omb_requestAbort(0);
+    std::atomic<int> aborted{0};
+    together(4, [&](int) {
+        try {
+            Omb_checkAbort();
+        } catch (const OmbXAbort&) {
+            ++aborted;
+        }
+    });
+    EXPECT_EQ(aborted, 1);
+}
+
+TEST(Concurrency, TheCollectorStopsCleanlyWhileCollectionsAreRequested) {
+    OmbRuntime::globalCacheSize(0);
+    for (int round = 0; round < 20; ++round) {
+        OmbGlobalCache& cache = OmbGlobalCache::instance();
+        OmbRef<TestCacheNode> node(new TestCacheNode);
+        cache.addDataSet(node.get(), 1);
+        together(3, [&](int t) {
+            for (std::uint64_t i = 0; i < 200; ++i) {
+                const OmbRef<OmbCacheGen> gen = cache.newGeneration();
+                OmbRef<TestLeaf> leaf(new TestLeaf(64, gen));
+                node->gcAdd(static_cast<std::uint64_t>(t) * 1000 + i, leaf.get());
+                node->gcGet(static_cast<std::uint64_t>(t) * 1000 + i / 2);
+                cache.collectAsync();
+            }
+        });
+        cache.collect();
+        OmbGlobalCache::destroy();
+    }
+    OmbRuntime::globalCacheSize(300);
 }

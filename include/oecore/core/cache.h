@@ -18,6 +18,7 @@
 #include <functional>
 #include <map>
 #include <mutex>
+#include <unordered_map>
 #include <unordered_set>
 #include <vector>
 
@@ -110,11 +111,11 @@ private:
     void unfile(std::uint64_t key, std::uint64_t bucket);
     // Removes the entry; its reference is handed to released so that the
     // child dies after the mutex is left.
-    void erase(std::map<std::uint64_t, Entry>::iterator it, std::vector<OmbCacheRef>& released);
+    void erase(std::unordered_map<std::uint64_t, Entry>::iterator it, std::vector<OmbCacheRef>& released);
 
     std::recursive_mutex ownMutex_;
     std::recursive_mutex& mutex_;
-    std::map<std::uint64_t, Entry> children_;
+    std::unordered_map<std::uint64_t, Entry> children_;
     std::map<std::uint64_t, std::unordered_set<std::uint64_t>> buckets_;
     std::size_t size_ = 0;
     OmbRef<OmbCacheGen> generation_;

@@ -3,7 +3,9 @@
 // OmbXInvalidOperation instead of deadlocking, and recursive forms can be
 // offered on top.
 //
-// Thread safety: all operations may be called from any thread.
+// Thread safety: all operations may be called from any thread. Which threads
+// hold read locks is kept per thread, so readers share nothing but the spin
+// lock; a lock must not be destroyed while a thread still holds it.
 #pragma once
 
 #include <oecore/core/engineobject.h>
