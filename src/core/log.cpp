@@ -51,26 +51,20 @@ void OmbLog::log(OmbLogLevel level, const OmbString& message) {
     }
 }
 
+void OmbLog::logText(OmbLogLevel level, const char* message) {
+    if (message && isActive(level)) log(level, OmbString(message));
+}
+
 void OmbLog::debug(const OmbString& message) { log(OmbLogDebug, message); }
-void OmbLog::debug(const char* message) {
-    if (message && isActive(OmbLogDebug)) log(OmbLogDebug, OmbString(message));
-}
+void OmbLog::debug(const char* message) { logText(OmbLogDebug, message); }
 void OmbLog::info(const OmbString& message) { log(OmbLogInfo, message); }
-void OmbLog::info(const char* message) {
-    if (message && isActive(OmbLogInfo)) log(OmbLogInfo, OmbString(message));
-}
+void OmbLog::info(const char* message) { logText(OmbLogInfo, message); }
 void OmbLog::warning(const OmbString& message) { log(OmbLogWarning, message); }
-void OmbLog::warning(const char* message) {
-    if (message && isActive(OmbLogWarning)) log(OmbLogWarning, OmbString(message));
-}
+void OmbLog::warning(const char* message) { logText(OmbLogWarning, message); }
 void OmbLog::error(const OmbString& message) { log(OmbLogError, message); }
-void OmbLog::error(const char* message) {
-    if (message && isActive(OmbLogError)) log(OmbLogError, OmbString(message));
-}
+void OmbLog::error(const char* message) { logText(OmbLogError, message); }
 void OmbLog::fatal(const OmbString& message) { log(OmbLogFatal, message); }
-void OmbLog::fatal(const char* message) {
-    if (message && isActive(OmbLogFatal)) log(OmbLogFatal, OmbString(message));
-}
+void OmbLog::fatal(const char* message) { logText(OmbLogFatal, message); }
 
 OmbLogLevel OmbLog::logLevel() { return static_cast<OmbLogLevel>(state().level.load(std::memory_order_relaxed)); }
 

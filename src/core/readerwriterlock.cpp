@@ -102,38 +102,6 @@ void OmbReaderWriterLock::releaseWriterLock() {
     state_->lock.unlock();
 }
 
-OmbAcquireReaderLock::OmbAcquireReaderLock(OmbRef<OmbReaderWriterLock> lock) : lock_(std::move(lock)) { acquire(); }
-
-OmbAcquireReaderLock::~OmbAcquireReaderLock() { release(); }
-
-void OmbAcquireReaderLock::acquire() {
-    if (!lock_ || held_) return;
-    lock_->acquireReaderLock();
-    held_ = true;
-}
-
-void OmbAcquireReaderLock::release() {
-    if (!held_) return;
-    held_ = false;
-    lock_->releaseReaderLock();
-}
-
-OmbAcquireWriterLock::OmbAcquireWriterLock(OmbRef<OmbReaderWriterLock> lock) : lock_(std::move(lock)) { acquire(); }
-
-OmbAcquireWriterLock::~OmbAcquireWriterLock() { release(); }
-
-void OmbAcquireWriterLock::acquire() {
-    if (!lock_ || held_) return;
-    lock_->acquireWriterLock();
-    held_ = true;
-}
-
-void OmbAcquireWriterLock::release() {
-    if (!held_) return;
-    held_ = false;
-    lock_->releaseWriterLock();
-}
-
 OmbReuseWriterOrAcquireRecursiveReaderLock::OmbReuseWriterOrAcquireRecursiveReaderLock(OmbRef<OmbReaderWriterLock> lock)
     : lock_(std::move(lock)) {
     if (!lock_) return;

@@ -39,18 +39,6 @@ bool environment(const char* name, OmbString& value) {
     return !value.empty();
 }
 
-// An on-by-default setting that the environment can only turn off.
-void turnOffUnlessOne(const char* name, bool& setting) {
-    OmbString value;
-    if (environment(name, value) && value != OmbString::literal("1")) setting = false;
-}
-
-// An off-by-default setting that the environment can only turn on.
-void turnOnIfOne(const char* name, bool& setting) {
-    OmbString value;
-    if (environment(name, value) && value == OmbString::literal("1")) setting = true;
-}
-
 }  // namespace
 
 OmbString OmbSettingsFile::defaultFileName() {
@@ -67,6 +55,31 @@ OmbRef<OmbSettingsFile> OmbSettingsFile::load(const OmbString& fileName) {
     if (!settings->readFile(fileName)) settings->readEnvironment();
     return settings;
 }
+
+// The boolean settings: file key, environment variable, field, default. The
+// environment can only switch a setting away from its default: an
+// on-by-default one goes off for any value but "1", an off-by-default one
+// goes on for "1" only.
+struct OmbSettingsFile::BoolKey {
+    const char* key;
+    const char* variable;
+    bool OmbSettingsFile::*field;
+    bool defaultValue;
+};
+
+const OmbSettingsFile::BoolKey OmbSettingsFile::boolKeys[] = {
+    {"OPENGL_STENCIL_BUFFER", "OMBRAVEL_ENGINE_OPENGL_STENCILBUFFER", &OmbSettingsFile::openGLStencilBuffer_, true},
+    {"OPENGL_TEXTURE_NONPOWEROFTWO", "OMBRAVEL_ENGINE_OPENGL_TEXTURE_NONPOWEROFTWO",
+     &OmbSettingsFile::openGLNonPowerOfTwoTextures_, true},
+    {"OPENGL_HIDDEN_WINDOW", "OMBRAVEL_ENGINE_OPENGL_HIDDEN_WINDOW", &OmbSettingsFile::openGLHiddenWindow_, true},
+    {"DIRECTX_MULTISAMPLE_2", "OMBRAVEL_ENGINE_DIRECTX_MULTISAMPLE_2", &OmbSettingsFile::directXMultiSample2_, false},
+    {"DIRECTX_TEXTURE_NONPOWEROFTWO", "OMBRAVEL_ENGINE_DIRECTX_TEXTURE_NONPOWEROFTWO",
+     &OmbSettingsFile::directXNonPowerOfTwoTextures_, true},
+    {"DIRECTX_VSYNC", "OMBRAVEL_ENGINE_DIRECTX_VSYNC", &OmbSettingsFile::directXVSync_, true},
+    {"SAFE_GDAL_LOCKING", "OMBRAVEL_ENGINE_SAFE_GDAL_LOCKING", &OmbSettingsFile::safeGdalLocking_, false},
+    {"TACTICAL_POINT_TEXT_HALO", "OMBRAVEL_ENGINE_TACTICAL_POINT_TEXT_HALO", &OmbSettingsFile::tacticalPointTextHalo_,
+     true},
+};
 
 bool OmbSettingsFile::readFile(const OmbString& fileName) {
     std::ifstream in(fileName.dataUtf8(), std::ios::binary);
@@ -88,44 +101,24 @@ bool OmbSettingsFile::readFile(const OmbString& fileName) {
         if (parts.size() != 2) continue;
         const OmbString& key = parts[0];
         const OmbString& value = parts[1];
-        if (key == OmbString::literal("IGNORE_ENVIRONMENT_VARIABLES"))
-            ignoreEnvironment = toBool(value, false);
-        else if (key == OmbString::literal("OPENGL_STENCIL_BUFFER"))
-            openGLStencilBuffer_ = toBool(value, true);
-        else if (key == OmbString::literal("OPENGL_TEXTURE_NONPOWEROFTWO"))
-            openGLNonPowerOfTwoTextures_ = toBool(value, true);
-        else if (key == OmbString::literal("OPENGL_HIDDEN_WINDOW"))
-            openGLHiddenWindow_ = toBool(value, true);
-        else if (key == OmbString::literal("DIRECTX_MULTISAMPLE_2"))
-            directXMultiSample2_ = toBool(value, false);
-        else if (key == OmbString::literal("DIRECTX_TEXTURE_NONPOWEROFTWO"))
-            directXNonPowerOfTwoTextures_ = toBool(value, true);
-        else if (key == OmbString::literal("DIRECTX_VSYNC"))
-            directXVSync_ = toBool(value, true);
-        else if (key == OmbString::literal("SAFE_GDAL_LOCKING"))
-            safeGdalLocking_ = toBool(value, false);
-        else if (key == OmbString::literal("LOG_FILE"))
-            logFileName_ = value;
-        else if (key == OmbString::literal("TACTICAL_POINT_TEXT_HALO"))
-            tacticalPointTextHalo_ = toBool(value, true);
-        else if (key == OmbString::literal("CATALOG_TIMEOUT"))
-            catalogTimeout_ = toTimeout(value);
-        else if (key == OmbString::literal("MEMORY_FRAGMENTATION_LOG_FILE"))
-            memoryFragmentationLog_ = value;
+        if (key == OmbString::literal("IGNORE_ENVIRONMENT_VARIABLES")) ignoreEnvironment = toBool(value, false);
+        if (key == OmbString::literal("LOG_FILE")) logFileName_ = value;
+        if (key == OmbString::literal("CATALOG_TIMEOUT")) catalogTimeout_ = toTimeout(value);
+        if (key == OmbString::literal("MEMORY_FRAGMENTATION_LOG_FILE")) memoryFragmentationLog_ = value;
+        for (const BoolKey& b : boolKeys)
+            if (key == OmbString::literal(b.key)) this->*b.field = toBool(value, b.defaultValue);
     }
     return ignoreEnvironment;
 }
 
 void OmbSettingsFile::readEnvironment() {
-    turnOffUnlessOne("OMBRAVEL_ENGINE_OPENGL_STENCILBUFFER", openGLStencilBuffer_);
-    turnOffUnlessOne("OMBRAVEL_ENGINE_OPENGL_TEXTURE_NONPOWEROFTWO", openGLNonPowerOfTwoTextures_);
-    turnOffUnlessOne("OMBRAVEL_ENGINE_OPENGL_HIDDEN_WINDOW", openGLHiddenWindow_);
-    turnOnIfOne("OMBRAVEL_ENGINE_DIRECTX_MULTISAMPLE_2", directXMultiSample2_);
-    turnOffUnlessOne("OMBRAVEL_ENGINE_DIRECTX_TEXTURE_NONPOWEROFTWO", directXNonPowerOfTwoTextures_);
-    turnOffUnlessOne("OMBRAVEL_ENGINE_DIRECTX_VSYNC", directXVSync_);
-    turnOnIfOne("OMBRAVEL_ENGINE_SAFE_GDAL_LOCKING", safeGdalLocking_);
-    turnOffUnlessOne("OMBRAVEL_ENGINE_TACTICAL_POINT_TEXT_HALO", tacticalPointTextHalo_);
     OmbString value;
+    for (const BoolKey& b : boolKeys) {
+        if (!environment(b.variable, value)) continue;
+        const bool one = value == OmbString::literal("1");
+        if (b.defaultValue && !one) this->*b.field = false;
+        if (!b.defaultValue && one) this->*b.field = true;
+    }
     if (environment("OMBRAVEL_ENGINE_CATALOG_TIMEOUT", value)) catalogTimeout_ = toTimeout(value);
     if (environment("OMBRAVEL_ENGINE_MEMORY_FRAGMENTATION_LOG", value)) memoryFragmentationLog_ = value;
 }

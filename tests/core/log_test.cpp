@@ -128,8 +128,3 @@ TEST(RollingFileLogAppender, BadArgumentsSayWhat) {
     dir.write("file", "");
     EXPECT_EQ(message((dir / "file/sub/x.log").string(), 1), "Invalid argument in Invalid log file.");
 }
-
-TEST(FormatMessage, FillsNumberedPlaceholders) {
-    EXPECT_EQ(Omb_formatMessage("(%1%, %2%) %1% %3% 100%", {OmbString("a"), OmbString("b")}),
-              OmbString("(a, b) a %3% 100%"));
-}

@@ -1,3 +1,4 @@
+#include <oecore/core/cache.h>
 #include <oecore/core/cacheref.h>
 #include <oecore/core/ref.h>
 
@@ -104,26 +105,17 @@ TEST(Ref, CountsThroughTheBaseWhenTheTypedPointerDiffers) {
 
 namespace {
 
-class TestCachable : public OmbEngineObject, public OmbICachable {
+class TestCachable : public OmbEngineObject, public OmbAbstractCacheLeaf {
+    OMB_ENGINE_CLASS_INLINE(OmbEngineObject, "TestCachable", 0)
+
 public:
     explicit TestCachable(bool evictable) : evictable_(evictable) {}
-    TestCachable* clone() const override { return new TestCachable(*this); }
+    TestCachable* clone() const override { return new TestCachable(evictable_); }
     OmbRefCnt* asRefCnt() override { return this; }
     std::size_t gcSize() override { return 0; }
-    void gcGeneration(const OmbRef<OmbCacheGen>&) override {}
-    OmbRef<OmbCacheGen> gcGeneration() override { return OmbRef<OmbCacheGen>(); }
-    bool gcIsCacheLeaf() override { return true; }
     bool gcEvictable() override { return evictable_; }
-    bool gcEvictableNow() override { return true; }
-    OmbRef<OmbRefCnt> gcGet(std::uint64_t) override { return OmbRef<OmbRefCnt>(); }
-    void gcAdd(std::uint64_t, OmbICachable*) override {}
-    void gcRemove(std::uint64_t) override {}
-    void gcEvict(std::uint64_t) override {}
-    bool gcEmpty() override { return true; }
 
 private:
-    int myClassId_() const override { return 0; }
-    OmbClass* myRuntimeClass_() const override { return OmbEngineObject::runtimeClass(); }
     bool evictable_;
 };
 

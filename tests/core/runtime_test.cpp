@@ -190,15 +190,6 @@ TEST_F(RuntimeTest, StatusReportsStepThroughPercentages) {
     OmbRuntime::statusChangedEvent.slots[0] = nullptr;
 }
 
-TEST_F(RuntimeTest, GlobalCacheSizeIsAtomicallyReplaced) {
-    const int saved = OmbRuntime::globalCacheSize();
-    EXPECT_EQ(saved, 300);
-    OmbRuntime::globalCacheSize(12);
-    EXPECT_EQ(OmbRuntime::globalCacheSize(), 12);
-    EXPECT_EQ(OmbGlobalCache::limit(), 12u * 786432u);
-    OmbRuntime::globalCacheSize(saved);
-}
-
 TEST_F(RuntimeTest, ScreenResolutionFromSystemAndEnvironment) {
     const OmbScreen system = OmbScreen::fromSystem();
     EXPECT_EQ(system.dpiX(), 96);

@@ -63,6 +63,7 @@ public:
 
 private:
     static void log(OmbLogLevel level, const OmbString& message);
+    static void logText(OmbLogLevel level, const char* message);
 };
 
 // Fills "%1%", "%2%", ... in a log message pattern with the arguments.

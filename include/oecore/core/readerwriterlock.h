@@ -11,6 +11,7 @@
 #include <oecore/core/engineobject.h>
 
 #include <memory>
+#include <utility>
 
 class OmbReaderWriterLock : public OmbEngineObject {
     OMB_DECLARE_ENGINE_CLASS()
@@ -36,36 +37,40 @@ private:
     std::unique_ptr<State> state_;
 };
 
-// Holds the read side for its lifetime (a null lock is not locked).
-class OmbAcquireReaderLock {
+// Holds one side of a lock from construction to destruction, with
+// acquire() and release() in between (a null lock is never taken).
+template <void (OmbReaderWriterLock::*Acquire)(), void (OmbReaderWriterLock::*Release)()>
+class OmbLockGuard {
 public:
-    explicit OmbAcquireReaderLock(OmbRef<OmbReaderWriterLock> lock);
-    ~OmbAcquireReaderLock();
-    OmbAcquireReaderLock(const OmbAcquireReaderLock&) = delete;
-    OmbAcquireReaderLock& operator=(const OmbAcquireReaderLock&) = delete;
+    explicit OmbLockGuard(OmbRef<OmbReaderWriterLock> lock) : lock_(std::move(lock)) { acquire(); }
+    ~OmbLockGuard() { release(); }
+    OmbLockGuard(const OmbLockGuard&) = delete;
+    OmbLockGuard& operator=(const OmbLockGuard&) = delete;
 
-    void acquire();
-    void release();
+    void acquire() {
+        if (!lock_ || held_) return;
+        ((*lock_).*Acquire)();
+        held_ = true;
+    }
+    void release() {
+        if (!held_) return;
+        held_ = false;
+        ((*lock_).*Release)();
+    }
 
 private:
     OmbRef<OmbReaderWriterLock> lock_;
     bool held_ = false;
 };
 
-// Holds the write side for its lifetime (a null lock is not locked).
-class OmbAcquireWriterLock {
-public:
-    explicit OmbAcquireWriterLock(OmbRef<OmbReaderWriterLock> lock);
-    ~OmbAcquireWriterLock();
-    OmbAcquireWriterLock(const OmbAcquireWriterLock&) = delete;
-    OmbAcquireWriterLock& operator=(const OmbAcquireWriterLock&) = delete;
+class OmbAcquireReaderLock
+    : public OmbLockGuard<&OmbReaderWriterLock::acquireReaderLock, &OmbReaderWriterLock::releaseReaderLock> {
+    using OmbLockGuard::OmbLockGuard;
+};
 
-    void acquire();
-    void release();
-
-private:
-    OmbRef<OmbReaderWriterLock> lock_;
-    bool held_ = false;
+class OmbAcquireWriterLock
+    : public OmbLockGuard<&OmbReaderWriterLock::acquireWriterLock, &OmbReaderWriterLock::releaseWriterLock> {
+    using OmbLockGuard::OmbLockGuard;
 };
 
 // For code that only reads: inside a writer's critical region it re-enters

@@ -31,6 +31,9 @@ public:
     const OmbString& memoryFragmentationLog() const noexcept { return memoryFragmentationLog_; }
 
 private:
+    struct BoolKey;
+    static const BoolKey boolKeys[];
+
     OmbSettingsFile() = default;
     // Returns whether the environment is to be ignored.
     bool readFile(const OmbString& fileName);
