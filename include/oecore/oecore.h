@@ -35,5 +35,11 @@
 #include <oecore/core/vec.h>
 
 #include <oecore/config/boxedvalue.h>
+#include <oecore/config/classdescription.h>
 #include <oecore/config/classmetadata.h>
+#include <oecore/config/configuration.h>
+#include <oecore/config/resourceresolver.h>
 #include <oecore/config/valueparsers.h>
+#include <oecore/config/xmlparser.h>
+#include <oecore/config/xmlserializer.h>
+#include <oecore/config/xmlutilities.h>

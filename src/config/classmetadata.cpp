@@ -1,7 +1,6 @@
 #include <oecore/config/boxedvalue.h>
 #include <oecore/config/classmetadata.h>
 #include <oecore/config/valueparsers.h>
-#include <oecore/core/engineobject.h>
 #include <oecore/core/exception.h>
 #include <oecore/core/stringbuilder.h>
 
@@ -52,23 +51,3 @@ OmbRef<OmbRefCnt> StringMetaData::createInstance(OmbXmlParserContext&, TiXmlElem
 }
 
 OmbRef<OmbRefCnt> CommentMetaData::createInstance(OmbXmlParserContext&, TiXmlElement*) { return OmbRef<OmbRefCnt>(); }
-
-bool ChildObjectModeMetaData::fromString(const OmbString& text, int& value) {
-    if (text == OmbString::literal("TopLevel")) {
-        value = static_cast<int>(OmbChildObjectMode::TopLevel);
-        return true;
-    }
-    if (text == OmbString::literal("AllLevels")) {
-        value = static_cast<int>(OmbChildObjectMode::AllLevels);
-        return true;
-    }
-    return false;
-}
-
-OmbString ChildObjectModeMetaData::toString(int value) {
-    switch (static_cast<OmbChildObjectMode>(value)) {
-        case OmbChildObjectMode::TopLevel: return OmbString::literal("TopLevel");
-        case OmbChildObjectMode::AllLevels: return OmbString::literal("AllLevels");
-    }
-    return OmbString();
-}

@@ -46,6 +46,7 @@ struct RuntimeState {
     OmbRef<OmbReaderWriterLock> configurationLock;
     Registry predefined;
     Registry registered;
+    Registry sharedConfigs;
     std::mutex apisMutex;
     std::vector<RegisteredAPI> apis;
     // The release mutex guards the clean-up table and the pending releases.
@@ -157,6 +158,7 @@ void OmbRuntime::shutdown() {
     for (const RegisteredAPI& api : apisSnapshot())
         if (api.shutdown) api.shutdown();
     stopBackgroundThreads();
+    empty(s.sharedConfigs);
     releaseRuntimeObjects();
     OmbLog::info("Destroying predefined objects");
     empty(s.predefined);
@@ -220,6 +222,14 @@ void OmbRuntime::registerObject(const OmbString& name, const OmbRef<OmbEngineObj
 
 OmbRef<OmbEngineObject> OmbRuntime::getRegisteredObject(const OmbString& name) {
     return lookUp(state().registered, name);
+}
+
+void OmbRuntime::sharedConfig(const OmbString& name, const OmbRef<OmbEngineObject>& configuration) {
+    store(state().sharedConfigs, name, configuration);
+}
+
+OmbRef<OmbEngineObject> OmbRuntime::getSharedConfig(const OmbString& name) {
+    return lookUp(state().sharedConfigs, name);
 }
 
 void OmbRuntime::registerPredefinedClass(PredefinedClass cls, void (*create)(), void (*drop)()) {

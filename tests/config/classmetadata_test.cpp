@@ -1,7 +1,6 @@
 #include <oecore/config/boxedvalue.h>
 #include <oecore/config/classmetadata.h>
 #include <oecore/config/valueparsers.h>
-#include <oecore/core/engineobject.h>
 #include <oecore/core/exception.h>
 
 #include <gtest/gtest.h>

@@ -90,11 +90,3 @@ OMB_BUILT_IN_VALUE_METADATA(BoolMetaData, "bool")
 OMB_BUILT_IN_VALUE_METADATA(StringMetaData, "String")
 OMB_BUILT_IN_VALUE_METADATA(CommentMetaData, "Comment")
 #undef OMB_BUILT_IN_VALUE_METADATA
-
-// Generated-style metadata of the OmbChildObjectMode enumeration: value
-// names "TopLevel" and "AllLevels".
-class ChildObjectModeMetaData {
-public:
-    static bool fromString(const OmbString& text, int& value);
-    static OmbString toString(int value);
-};

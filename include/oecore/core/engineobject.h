@@ -34,6 +34,10 @@ using OmbEngineObjectVec =
 // root refers to, or everything reachable.
 enum class OmbChildObjectMode { TopLevel, AllLevels };
 
+// What saving writes: objects that hold features in memory write them only
+// with IncludeFeatures.
+enum class OmbSaveMode { Default = 0, IncludeFeatures = 1 };
+
 // Declares the class-level members every engine class has. Use in the class
 // body; OMB_DEFINE_ENGINE_CLASS in the source file defines them.
 #define OMB_DECLARE_ENGINE_CLASS()                                        \
@@ -124,6 +128,12 @@ public:
     OmbRef<OmbEngineObjectVec> getChildObjects(OmbChildObjectMode mode) const;
     // The first child object whose name equals name, or an empty reference.
     OmbRef<OmbEngineObject> findChildObject(const OmbString& name, OmbChildObjectMode mode) const;
+
+    // Writes the object, with everything it refers to, as a configuration
+    // document; the object becomes public. The file's namespace is its name
+    // without folder and extension; the string form uses "Memory".
+    void save(const OmbString& fileName, OmbSaveMode mode = OmbSaveMode::Default) const;
+    OmbString save(OmbSaveMode mode = OmbSaveMode::Default) const;
 
     // Non-empty only for the objects the runtime creates as predefined.
     const OmbString& predefinedName() const noexcept { return predefinedName_; }

@@ -17,6 +17,8 @@
 template <class T>
 class OmbRef {
 public:
+    using element_type = T;
+
     OmbRef() noexcept = default;
     OmbRef(std::nullptr_t) noexcept {}
     // Takes a reference on the object.

@@ -21,6 +21,11 @@
 
 #include <cstdint>
 
+class OmbConfiguration;
+class OmbConfigurationParameters;
+class OmbResourceResolver;
+enum class OmbDataSetInitialization;
+
 // Implemented by objects that own worker threads: stops them at shutdown.
 class IShutdownHandler {
 public:
@@ -45,6 +50,23 @@ public:
     // Orders configuration changes (writers) against walks of the object
     // graph (readers); null while the runtime is not initialised.
     static const OmbRef<OmbReaderWriterLock>& configurationLock();
+    // The resolver used when a load is given none. (Defined with the
+    // configuration language, like the load functions.)
+    static const OmbRef<OmbResourceResolver>& defaultResourceResolver();
+    // Read a .px document (see OmbXmlParser).
+    static OmbRef<OmbConfiguration> loadFile(const OmbString& fileName,
+                                             const OmbRef<OmbConfigurationParameters>& parameters,
+                                             OmbDataSetInitialization dataSetInitialization,
+                                             const OmbRef<OmbResourceResolver>& resolver);
+    static OmbRef<OmbConfiguration> loadString(const OmbString& text,
+                                               const OmbRef<OmbConfigurationParameters>& parameters,
+                                               OmbDataSetInitialization dataSetInitialization,
+                                               const OmbRef<OmbResourceResolver>& resolver);
+    // Configurations shared between loads, under their file's absolute path
+    // (OmbConfiguration objects; released at shutdown).
+    static void sharedConfig(const OmbString& name, const OmbRef<OmbEngineObject>& configuration);
+    static OmbRef<OmbEngineObject> getSharedConfig(const OmbString& name);
+
     // Take and release the configuration lock's write side.
     static void lock();
     static void unlock();
