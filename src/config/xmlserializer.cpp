@@ -8,6 +8,9 @@
 #include <cstdio>
 #include <filesystem>
 #include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
 
 namespace {
 
@@ -35,6 +38,18 @@ void buildDocument(const OmbEngineObject& object, const OmbString& ns, OmbSaveMo
     // that, public, it can be found again after loading.
     if (TiXmlElement* own = serializer.find(&object)) serializer.addReference(nullptr, own);
     serializer.writeNames();
+}
+
+// Sets an element's Name as its first attribute, where a loaded object
+// writes it too, so that saving what was loaded reproduces the same text.
+void setName(TiXmlElement* element, const OmbString& name) {
+    std::vector<std::pair<std::string, std::string>> others;
+    for (const TiXmlAttribute* a = element->FirstAttribute(); a; a = a->Next())
+        if (std::string_view(a->Name()) != "Name") others.emplace_back(a->Name(), a->Value());
+    for (const auto& [attribute, value] : others) element->RemoveAttribute(attribute);
+    element->RemoveAttribute("Name");
+    element->SetAttribute("Name", name.dataUtf8());
+    for (const auto& [attribute, value] : others) element->SetAttribute(attribute, value);
 }
 
 }  // namespace
@@ -67,7 +82,7 @@ void OmbXmlSerializer::writeNames() {
         for (int counter = 0;; ++counter) {
             OmbString candidate(tag + std::to_string(counter));
             if (usedNames_.insert(candidate).second) {
-                target->SetAttribute("Name", candidate.dataUtf8());
+                setName(target, candidate);
                 colliding_.erase(target);
                 break;
             }
@@ -134,7 +149,6 @@ void Omb_describedToXml(const OmbEngineObject& object, OmbXmlSerializer& seriali
     if (serializer.predefinedToXml(object, topLevel, parent, propertyName, isPublic)) return;
     const OmbClassDescription* description = OmbClassDescription::of(object.myRuntimeClass());
     auto* element = new TiXmlElement(object.myRuntimeClassName());
-    if (isPublic) element->SetAttribute("Public", "true");
     if (parent) {
         element->SetAttribute("Name", "");
         serializer.addReference(OmbXmlSerializer::addReferenceElement(topLevel, parent, propertyName), element);
@@ -162,6 +176,8 @@ void Omb_describedToXml(const OmbEngineObject& object, OmbXmlSerializer& seriali
             }
         }
     }
+    // After the properties, where a loaded object writes it too.
+    if (isPublic) element->SetAttribute("Public", "true");
     // Names given through properties are noted now that they are written.
     serializer.addObject(&object, element);
     topLevel->LinkEndChild(element);
