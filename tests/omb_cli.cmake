@@ -1,6 +1,7 @@
 # omb answers --help, --version and info, and rejects unknown commands.
 function(expect args rc pattern)
-  execute_process(COMMAND ${OMB} ${args} RESULT_VARIABLE got OUTPUT_VARIABLE out ERROR_VARIABLE err)
+  execute_process(COMMAND ${CMAKE_COMMAND} -E env OMBRAVEL_ENGINE_MODULE_PATH=${MODULE_DIR} ${OMB} ${args}
+                  RESULT_VARIABLE got OUTPUT_VARIABLE out ERROR_VARIABLE err)
   if(NOT got EQUAL rc)
     message(FATAL_ERROR "omb ${args}: exit ${got}, expected ${rc}\n${out}${err}")
   endif()
@@ -28,3 +29,23 @@ endif()
 expect("--log-level;loud;info" 1 "Illegal argument: --log-level loud")
 expect("--log-file;/proc/omb/x.log;info" 1 "Invalid log file")
 expect("--log-file" 2 "--log-file needs a value")
+
+# Configurations: listing, parameters, resaving and errors with positions.
+set(px_dir ${CMAKE_CURRENT_BINARY_DIR}/omb-cli-px)
+file(REMOVE_RECURSE ${px_dir})
+file(WRITE ${px_dir}/demo.px "<Configuration Namespace='Demo'>
+  <TestPluginObject Name='P' Public='true' Value='{ConfigurationParameter Key=value, DefaultValue=1}'/>
+  <TestPluginObject Name='Q' Public='true' Value='2'/>
+</Configuration>
+")
+expect("info;${px_dir}/demo.px" 0 "Demo.P  TestPluginObject\n  Demo.Q  TestPluginObject\n2 public objects")
+expect("resave;${px_dir}/demo.px;${px_dir}/copy.px;--param;value=7" 0 "")
+file(READ ${px_dir}/copy.px copy)
+if(NOT copy MATCHES "Name=\"P\" Value=\"7\" Public=\"true\"")
+  message(FATAL_ERROR "resaved file lacks the parameter's value:\n${copy}")
+endif()
+expect("info;${px_dir}/copy.px" 0 "copy.P  TestPluginObject")
+file(WRITE ${px_dir}/broken.px "<Configuration Namespace='Demo'>\n  <TestPluginObject Value='many'/>\n</Configuration>\n")
+expect("info;${px_dir}/broken.px" 1 "broken.px: Failed to convert 'many' to type int. Row 2, Column 3.")
+expect("info;${px_dir}/missing.px" 1 "Failed to open file: ")
+expect("resave;${px_dir}/demo.px" 2 "resave takes 2 file names")

@@ -10,6 +10,9 @@
 #include <filesystem>
 #include <string>
 
+#include <tinyxml.h>
+
+#include "documentwriter.h"
 #include "pluginloader.h"
 
 OMB_DEFINE_ENGINE_CLASS(OmbConfiguration, OmbEngineObject, "Configuration", 0)
@@ -153,3 +156,12 @@ void OmbConfiguration::save(const OmbString& fileName, const OmbRef<OmbEngineObj
 }
 
 OmbString OmbConfiguration::save(const OmbRef<OmbEngineObject>& object, OmbSaveMode mode) { return object->save(mode); }
+
+void OmbConfiguration::savePublicObjects(const OmbString& fileName, OmbSaveMode mode) const {
+    const OmbRef<OmbEngineObjectVec> objects = publicObjects();
+    std::vector<const OmbEngineObject*> list;
+    for (const OmbRef<OmbEngineObject>& object : *objects) list.push_back(object.get());
+    TiXmlDocument document;
+    oecore::detail::buildDocument(list, oecore::detail::namespaceOfFile(fileName), mode, comment_, document);
+    oecore::detail::writeDocument(document, fileName);
+}

@@ -5,6 +5,8 @@
 
 #include <tinyxml.h>
 
+#include "documentwriter.h"
+
 #include <cstdio>
 #include <filesystem>
 #include <string>
@@ -18,26 +20,6 @@ bool isInside(const TiXmlNode* node, const TiXmlNode* ancestor) {
     for (; node; node = node->Parent())
         if (node == ancestor) return true;
     return false;
-}
-
-// The document an object saves to: declaration, Configuration root and,
-// unless the object is predefined, the object with everything it refers to.
-void buildDocument(const OmbEngineObject& object, const OmbString& ns, OmbSaveMode mode, const OmbString& comment,
-                   TiXmlDocument& document) {
-    if (!comment.empty()) document.LinkEndChild(new TiXmlComment(comment.dataUtf8()));
-    document.LinkEndChild(new TiXmlDeclaration("1.0", "UTF-8", ""));
-    auto* root = new TiXmlElement("Configuration");
-    root->SetAttribute("Namespace", ns.dataUtf8());
-    root->SetAttribute("Version", "5.4.0.3");
-    root->SetAttribute("xmlns", OmbXmlSerializer::formatNamespace);
-    document.LinkEndChild(root);
-    if (!object.predefinedName().empty()) return;
-    OmbXmlSerializer serializer(mode);
-    object.toXml(serializer, root, nullptr, "", "", true);
-    // The saved object is written after what it refers to; it gets a name so
-    // that, public, it can be found again after loading.
-    if (TiXmlElement* own = serializer.find(&object)) serializer.addReference(nullptr, own);
-    serializer.writeNames();
 }
 
 // Sets an element's Name as its first attribute, where a loaded object
@@ -183,19 +165,31 @@ void Omb_describedToXml(const OmbEngineObject& object, OmbXmlSerializer& seriali
     topLevel->LinkEndChild(element);
 }
 
-OmbString OmbEngineObject::save(OmbSaveMode mode) const {
-    TiXmlDocument document;
-    buildDocument(*this, OmbString::literal("Memory"), mode, saveComment(), document);
-    TiXmlPrinter printer;
-    document.Accept(&printer);
-    return OmbString(printer.CStr());
+namespace oecore::detail {
+
+void buildDocument(const std::vector<const OmbEngineObject*>& objects, const OmbString& ns, OmbSaveMode mode,
+                   const OmbString& comment, TiXmlDocument& document) {
+    if (!comment.empty()) document.LinkEndChild(new TiXmlComment(comment.dataUtf8()));
+    document.LinkEndChild(new TiXmlDeclaration("1.0", "UTF-8", ""));
+    auto* root = new TiXmlElement("Configuration");
+    root->SetAttribute("Namespace", ns.dataUtf8());
+    root->SetAttribute("Version", "5.4.0.3");
+    root->SetAttribute("xmlns", OmbXmlSerializer::formatNamespace);
+    document.LinkEndChild(root);
+    OmbXmlSerializer serializer(mode);
+    for (const OmbEngineObject* object : objects) {
+        if (!object->predefinedName().empty()) continue;
+        object->toXml(serializer, root, nullptr, "", "", true);
+        // A saved object is written after what it refers to; it gets a name
+        // so that, public, it can be found again after loading.
+        if (TiXmlElement* own = serializer.find(object)) serializer.addReference(nullptr, own);
+    }
+    serializer.writeNames();
 }
 
-void OmbEngineObject::save(const OmbString& fileName, OmbSaveMode mode) const {
+void writeDocument(const TiXmlDocument& document, const OmbString& fileName) {
     namespace fs = std::filesystem;
     const fs::path path(std::string(fileName.view()));
-    TiXmlDocument document;
-    buildDocument(*this, OmbString(path.stem().string()), mode, saveComment(), document);
     // Written beside the target and renamed over it, so that a failed save
     // never leaves a half-written file behind.
     const fs::path partial = path.string() + ".partial";
@@ -209,4 +203,24 @@ void OmbEngineObject::save(const OmbString& fileName, OmbSaveMode mode) const {
         fs::remove(partial, error);
         OMB_THROW(GenericException, OmbString("Failed to write file ") + fileName);
     }
+}
+
+OmbString namespaceOfFile(const OmbString& fileName) {
+    return OmbString(std::filesystem::path(std::string(fileName.view())).stem().string());
+}
+
+}  // namespace oecore::detail
+
+OmbString OmbEngineObject::save(OmbSaveMode mode) const {
+    TiXmlDocument document;
+    oecore::detail::buildDocument({this}, OmbString::literal("Memory"), mode, saveComment(), document);
+    TiXmlPrinter printer;
+    document.Accept(&printer);
+    return OmbString(printer.CStr());
+}
+
+void OmbEngineObject::save(const OmbString& fileName, OmbSaveMode mode) const {
+    TiXmlDocument document;
+    oecore::detail::buildDocument({this}, oecore::detail::namespaceOfFile(fileName), mode, saveComment(), document);
+    oecore::detail::writeDocument(document, fileName);
 }

@@ -73,7 +73,9 @@ TEST(XmlSerializer, ValuesAtTheirDefaultAreNotWrittenAndDoublesRoundTrip) {
     EXPECT_EQ(text.find("Mode"), std::string::npos) << text;
     OmbRef<TestShape> s = shape(1e-300);
     s->mode = OmbChildObjectMode::AllLevels;
-    s->label = OmbString("K\xC3\xB8" "benhavn & <quay>");
+    s->label = OmbString(
+        "K\xC3\xB8"
+        "benhavn & <quay>");
     s->count = -9000000000LL;
     const auto again = omb_dynamic_cast<TestShape>(reload(saved(*s))->getPublicObject(OmbString("TestShape0")));
     EXPECT_EQ(again->width, 1e-300);
@@ -115,8 +117,8 @@ TEST(XmlSerializer, FilesTakeTheirNamespaceFromTheirNameAndFailuresLeaveNothing)
     const std::string text = readFile(dir / "harbour.px");
     EXPECT_NE(text.find("Namespace=\"harbour\""), std::string::npos) << text;
     EXPECT_NE(text.find("Version=\"5.4.0.3\""), std::string::npos) << text;
-    const auto loaded = OmbXmlParser::loadFile(OmbString((dir / "harbour.px").string()), {},
-                                               OmbDataSetInitialization::Delayed, {});
+    const auto loaded =
+        OmbXmlParser::loadFile(OmbString((dir / "harbour.px").string()), {}, OmbDataSetInitialization::Delayed, {});
     EXPECT_TRUE(loaded->getPublicObject(OmbString("harbour.Quay")));
 
     const std::string missing = (dir / "no/such/folder/x.px").string();

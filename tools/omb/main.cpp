@@ -13,10 +13,13 @@ void printHelp(std::ostream& out) {
     out << "Usage: omb [options] <command>\n"
            "\n"
            "Commands:\n"
-           "  info        print the library version and the registered engine classes\n"
-           "  classes     list the registered engine classes with their class records\n"
+           "  info                   print the library version and the registered engine classes\n"
+           "  info FILE.px           load a configuration and list its public objects\n"
+           "  classes                list the registered engine classes with their class records\n"
+           "  resave FILE.px OUT.px  load a configuration and save its public objects again\n"
            "\n"
            "Options:\n"
+           "  --param KEY=VALUE  a configuration parameter for ConfigurationParameter (repeatable)\n"
            "  --log-file FILE    write the library's log to FILE (rotated at 10 MiB, 4 files)\n"
            "  --log-level LEVEL  all, debug, info, warning, error, fatal or off (default: off,\n"
            "                     or all when a log file is given)\n"
@@ -40,6 +43,8 @@ void printClasses(std::ostream& out) {
 
 struct Options {
     std::string command;
+    std::vector<std::string> files;
+    std::vector<std::pair<std::string, std::string>> params;
     std::string logFile;
     std::string logLevel;
 };
@@ -48,7 +53,7 @@ struct Options {
 bool parse(int argc, char** argv, Options& options) {
     for (int i = 1; i < argc; ++i) {
         const std::string arg = argv[i];
-        const bool takesValue = arg == "--log-file" || arg == "--log-level";
+        const bool takesValue = arg == "--log-file" || arg == "--log-level" || arg == "--param";
         if (takesValue && i + 1 >= argc) {
             std::cerr << "omb: " << arg << " needs a value; see 'omb --help'\n";
             return false;
@@ -57,12 +62,18 @@ bool parse(int argc, char** argv, Options& options) {
             options.logFile = argv[++i];
         else if (arg == "--log-level")
             options.logLevel = argv[++i];
-        else if (options.command.empty())
+        else if (arg == "--param") {
+            const std::string pair = argv[++i];
+            const std::size_t equals = pair.find('=');
+            if (equals == std::string::npos || equals == 0) {
+                std::cerr << "omb: --param takes KEY=VALUE, not '" << pair << "'\n";
+                return false;
+            }
+            options.params.emplace_back(pair.substr(0, equals), pair.substr(equals + 1));
+        } else if (options.command.empty())
             options.command = arg;
-        else {
-            std::cerr << "omb: unexpected argument '" << arg << "'; see 'omb --help'\n";
-            return false;
-        }
+        else
+            options.files.push_back(arg);
     }
     return true;
 }
@@ -83,10 +94,45 @@ void startLog(const Options& options) {
     }
 }
 
+OmbRef<OmbConfiguration> loadConfiguration(const Options& options) {
+    OmbRef<OmbConfigurationParameters> params(new OmbConfigurationParameters);
+    for (const auto& [key, value] : options.params) params->add(OmbString(key), OmbString(value));
+    return OmbRef<OmbConfiguration>(
+        new OmbConfiguration(OmbString(options.files.at(0)), params, OmbDataSetInitialization::Immediate));
+}
+
+void printPublicObjects(const OmbConfiguration& configuration) {
+    const OmbRef<OmbVec<OmbString>> names = configuration.publicNames();
+    for (const OmbString& name : *names) {
+        const OmbRef<OmbEngineObject> object = configuration.getPublicObject(name);
+        std::cout << "  " << name << "  " << (object ? object->myRuntimeClassName() : "(value)") << "\n";
+    }
+    std::cout << names->size() << " public objects\n";
+}
+
+bool expectFiles(const Options& options, std::size_t count) {
+    if (options.files.size() == count) return true;
+    std::cerr << "omb: " << options.command << " takes " << count << " file name" << (count > 1 ? "s" : "")
+              << "; see 'omb --help'\n";
+    return false;
+}
+
 int run(const Options& options) {
-    if (options.command == "info") {
+    if (options.command == "info" && options.files.empty()) {
         std::cout << "OECore " << OmbRuntime::version() << "\n";
         printClasses(std::cout);
+        return 0;
+    }
+    if (options.command == "info") {
+        if (!expectFiles(options, 1)) return 2;
+        const OmbRef<OmbConfiguration> configuration = loadConfiguration(options);
+        std::cout << options.files[0] << ": namespace " << configuration->defaultNamespace() << "\n";
+        printPublicObjects(*configuration);
+        return 0;
+    }
+    if (options.command == "resave") {
+        if (!expectFiles(options, 2)) return 2;
+        loadConfiguration(options)->savePublicObjects(OmbString(options.files[1]));
         return 0;
     }
     if (options.command == "classes") {
@@ -121,7 +167,7 @@ int main(int argc, char** argv) {
         OmbRuntime::init();
         status = run(options);
     } catch (const OmbException& e) {
-        std::cerr << "omb: " << e.asString() << "\n";
+        std::cerr << "omb: " << (options.files.empty() ? "" : options.files[0] + ": ") << e.asString() << "\n";
     }
     OmbRuntime::shutdown();
     return status;

@@ -75,6 +75,9 @@ public:
     const OmbString& defaultNamespace() const noexcept { return defaultNamespace_; }
     void setDefaultNamespace(const OmbString& ns) { defaultNamespace_ = ns; }
 
+    // Writes every public engine object into one document, in name order.
+    void savePublicObjects(const OmbString& fileName, OmbSaveMode mode = OmbSaveMode::Default) const;
+
     static void save(const OmbString& fileName, const OmbRef<OmbEngineObject>& object,
                      OmbSaveMode mode = OmbSaveMode::Default);
     static OmbString save(const OmbRef<OmbEngineObject>& object, OmbSaveMode mode = OmbSaveMode::Default);
