@@ -9,6 +9,7 @@ packages=(
   libtinyxml-dev
   libtbb-dev
   googletest libgtest-dev libbenchmark-dev
+  clang libfuzzer-14-dev libclang-rt-14-dev
 )
 
 missing=()

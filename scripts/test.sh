@@ -14,3 +14,12 @@ ASAN_OPTIONS=detect_leaks=1:strict_string_checks=1 UBSAN_OPTIONS=print_stacktrac
 bash "$root/scripts/build.sh" tsan -DCMAKE_BUILD_TYPE=Debug -DOECORE_SANITIZE=thread \
   -DOECORE_BUILD_BENCHMARKS=OFF -- --target test_core_concurrency
 TSAN_OPTIONS=halt_on_error=1 ctest --test-dir "$root/build/tsan" -L concurrency --output-on-failure
+
+# The .px reader under libFuzzer for a minute, starting from the seeds.
+bash "$root/scripts/build.sh" fuzz -DCMAKE_CXX_COMPILER=clang++ -DCMAKE_BUILD_TYPE=Debug -DOECORE_FUZZ=ON \
+  -DOECORE_SANITIZE=address,undefined -DOECORE_BUILD_TESTS=OFF -DOECORE_BUILD_BENCHMARKS=OFF \
+  -- --target fuzz_loadstring
+mkdir -p "$root/build/fuzz/corpus"
+"$root/build/fuzz/tests/fuzz/fuzz_loadstring" -max_total_time=60 -timeout=10 -rss_limit_mb=2048 \
+  -artifact_prefix="$root/build/fuzz/" -print_final_stats=1 "$root/build/fuzz/corpus" "$root/tests/fuzz/corpus"
+echo "fuzz: 1 passed, 0 failed"

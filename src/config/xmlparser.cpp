@@ -145,6 +145,7 @@ OmbRef<OmbRefCnt> OmbXmlParser::parseMarkupExtension(OmbXmlParserContext& contex
         if (equals < 0) break;  // the argument list ends here
         const OmbString name = OmbStringUtils::strip(pair.substr(0, static_cast<std::size_t>(equals)), ' ');
         const OmbString value = OmbStringUtils::strip(pair.substr(static_cast<std::size_t>(equals) + 1), ' ');
+        if (name.empty()) continue;  // "=value" names nothing
         extension.SetAttribute(name.dataUtf8(), value.dataUtf8());
     }
     return context.createInstance(&extension);

@@ -1,8 +1,10 @@
 #include <oecore/config/xmlutilities.h>
 #include <oecore/core/stringbuilder.h>
+#include <oecore/core/stringutils.h>
 
 #include <tinyxml.h>
 
+#include <algorithm>
 #include <fstream>
 #include <sstream>
 #include <string_view>
@@ -40,9 +42,27 @@ int nestingDepth(std::string_view text) {
     return deepest;
 }
 
+// "(row, column)" of a byte offset, as the XML parser reports positions.
+OmbString positionOf(std::string_view text, std::size_t offset) {
+    std::size_t row = 1;
+    std::size_t lineStart = 0;
+    for (std::size_t i = 0; i < offset; ++i)
+        if (text[i] == '\n') ++row, lineStart = i + 1;
+    return OmbString("(" + std::to_string(row) + ", " + std::to_string(offset - lineStart + 1) + ")");
+}
+
 }  // namespace
 
 bool OmbXmlUtilities::loadXmlFromString(const OmbString& text, TiXmlDocument& document, OmbString& error) {
+    // The XML parser trusts multi-byte sequences and stops at a zero byte:
+    // malformed text never reaches it.
+    std::size_t bad = 0;
+    const bool valid = OmbStringUtils::isValidUtf8(text.view(), &bad);
+    const std::size_t zero = text.view().find('\0');
+    if (!valid || zero != std::string_view::npos) {
+        error = positionOf(text.view(), valid ? zero : std::min(bad, zero));
+        return false;
+    }
     if (nestingDepth(text.view()) > maximumNesting) {
         error = OmbString("(elements nested more than " + std::to_string(maximumNesting) + " levels deep)");
         return false;

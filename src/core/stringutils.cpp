@@ -5,6 +5,8 @@
 #include <istream>
 #include <string>
 
+#include "utf.h"
+
 namespace OmbStringUtils {
 
 void split(const OmbString& s, char separator, std::vector<OmbString>& out) {
@@ -92,6 +94,17 @@ double atof(const OmbString& s) {
 
 bool isEqualIgnoreCase(const OmbString& a, const OmbString& b) {
     return a.size() == b.size() && a.toUpper() == b.toUpper();
+}
+
+bool isValidUtf8(std::string_view bytes, std::size_t* badOffset) {
+    for (std::size_t pos = 0; pos < bytes.size();) {
+        const std::size_t start = pos;
+        if (oecore::detail::decodeUtf8(bytes.data(), bytes.size(), pos) < 0) {
+            if (badOffset) *badOffset = start;
+            return false;
+        }
+    }
+    return true;
 }
 
 bool wildcardMatch(const OmbString& pattern, const OmbString& text) {

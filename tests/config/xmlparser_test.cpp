@@ -144,6 +144,9 @@ TEST(XmlParser, MarkupExtensionsInBraces) {
     // An argument without "=" ends the list: the default is never read.
     EXPECT_EQ(loadError(R"(<TestShape Width="{ConfigurationParameter Key=w, broken, DefaultValue=3}"/>)"),
               "Failed to convert '' to type double. Row 3, Column 1.");
+    // A pair without a name is passed over.
+    EXPECT_EQ(loadError(R"(<TestShape Width="{ConfigurationParameter =w, Key=k, DefaultValue=5}" Label="{X =y}"/>)"),
+              "Cannot create instance of class X since the type has not been registered. Row 3, Column 1.");
     // Three characters, a letter in braces: an extension without arguments.
     EXPECT_NE(loadError(R"(<TestShape Width="1" Label="{X}"/>)")
                   .find("Cannot create instance of class X since the type has not been registered."),
@@ -211,6 +214,18 @@ TEST(XmlParser, EveryErrorSaysWhatAndWhere) {
     EXPECT_EQ(errorOf([] { load("<OmbravelStudioBlob/>"); }),
               "File is a temporary Ombravel Studio file, and does not contain a complete configuration. It can only "
               "be opened by Ombravel Studio.");
+}
+
+TEST(XmlParser, MalformedTextNeverReachesTheXmlParser) {
+    const auto error = [](const std::string& text) {
+        return errorOf([&] {
+            OmbXmlParser::loadString(OmbString(std::string_view(text)), {}, OmbDataSetInitialization::Delayed, {});
+        });
+    };
+    EXPECT_EQ(error("<Configuration Namespace='x'>\n<TestShape Mode=\"\xE5\"/></Configuration>"),
+              "(2, 18): Not a valid Xml string.");
+    EXPECT_EQ(error(std::string("<Configuration Namespace='x'/>\0<x/>", 35)), "(1, 31): Not a valid Xml string.");
+    EXPECT_EQ(error(""), "(0, 0): Not a valid Xml string.");
 }
 
 TEST(XmlParser, LaterVersionsOnlyWarn) {

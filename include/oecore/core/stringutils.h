@@ -6,6 +6,7 @@
 
 #include <cstdint>
 #include <iosfwd>
+#include <string_view>
 #include <vector>
 
 namespace OmbStringUtils {
@@ -29,6 +30,10 @@ std::int64_t atoi64(const OmbString& s);
 double atof(const OmbString& s);
 
 bool isEqualIgnoreCase(const OmbString& a, const OmbString& b);
+
+// Whether the bytes are well-formed UTF-8; if not, badOffset is the byte
+// position of the first malformed sequence.
+bool isValidUtf8(std::string_view bytes, std::size_t* badOffset = nullptr);
 
 // Byte-wise, case-sensitive; "*" matches any run, "?" exactly one byte.
 bool wildcardMatch(const OmbString& pattern, const OmbString& text);
