@@ -61,7 +61,8 @@ void OmbXmlSerializer::writeNames() {
         const char* name = target->Attribute("Name");
         if (name && *name && !colliding_.count(target)) continue;
         const std::string tag = target->Value();
-        for (int counter = 0;; ++counter) {
+        // Counters only grow: every lower candidate was found taken before.
+        for (int& counter = nextCounter_[tag];; ++counter) {
             OmbString candidate(tag + std::to_string(counter));
             if (usedNames_.insert(candidate).second) {
                 setName(target, candidate);

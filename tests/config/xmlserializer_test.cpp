@@ -130,3 +130,17 @@ TEST(XmlSerializer, FilesTakeTheirNamespaceFromTheirNameAndFailuresLeaveNothing)
     }
     EXPECT_EQ(std::distance(std::filesystem::directory_iterator(dir.path()), {}), 1);
 }
+
+TEST(XmlSerializer, TheDocumentCommentTravelsWithTheConfiguration) {
+    TempDir dir;
+    const auto loaded = reload(
+        "<!-- Harbour map, survey 2026 -->\n<Configuration Namespace='Demo'>"
+        "<TestUnit Name='U' Public='true'/></Configuration>");
+    EXPECT_EQ(loaded->comment(), OmbString(" Harbour map, survey 2026 "));
+    loaded->savePublicObjects(OmbString((dir / "copy.px").string()));
+    const std::string text = readFile(dir / "copy.px");
+    EXPECT_EQ(text.rfind("<!-- Harbour map, survey 2026 -->", 0), 0u) << text;
+    EXPECT_EQ(OmbXmlParser::loadFile(OmbString((dir / "copy.px").string()), {}, OmbDataSetInitialization::Delayed, {})
+                  ->comment(),
+              loaded->comment());
+}

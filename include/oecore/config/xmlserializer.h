@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <map>
 #include <set>
+#include <string>
 #include <utility>
 #include <vector>
 
@@ -58,4 +59,6 @@ private:
     std::set<TiXmlElement*> colliding_;
     std::map<const OmbEngineObject*, TiXmlElement*> written_;
     std::vector<std::pair<TiXmlElement*, TiXmlElement*>> references_;
+    // Per tag, the counter the next generated name starts from.
+    std::map<std::string, int> nextCounter_;
 };
