@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Installs what the build needs, then runs the whole test suite: everything
-# under AddressSanitizer and UndefinedBehaviorSanitizer, and the concurrency
-# tests once more under ThreadSanitizer.
+# under AddressSanitizer and UndefinedBehaviorSanitizer, the .px reader under
+# libFuzzer for a minute, and the concurrency tests once more under
+# ThreadSanitizer.
 set -euo pipefail
 root=$(cd "$(dirname "$0")/.." && pwd)
 bash "$root/scripts/setup.sh"
@@ -11,10 +12,6 @@ bash "$root/scripts/build.sh" asan -DCMAKE_BUILD_TYPE=Debug -DOECORE_SANITIZE=ad
 ASAN_OPTIONS=detect_leaks=1:strict_string_checks=1 UBSAN_OPTIONS=print_stacktrace=1 \
   ctest --test-dir "$root/build/asan" --output-on-failure --parallel "$(nproc)"
 
-bash "$root/scripts/build.sh" tsan -DCMAKE_BUILD_TYPE=Debug -DOECORE_SANITIZE=thread \
-  -DOECORE_BUILD_BENCHMARKS=OFF -- --target test_core_concurrency
-TSAN_OPTIONS=halt_on_error=1 ctest --test-dir "$root/build/tsan" -L concurrency --output-on-failure
-
 # The .px reader under libFuzzer for a minute, starting from the seeds.
 bash "$root/scripts/build.sh" fuzz -DCMAKE_CXX_COMPILER=clang++ -DCMAKE_BUILD_TYPE=Debug -DOECORE_FUZZ=ON \
   -DOECORE_SANITIZE=address,undefined -DOECORE_BUILD_TESTS=OFF -DOECORE_BUILD_BENCHMARKS=OFF \
@@ -22,4 +19,7 @@ bash "$root/scripts/build.sh" fuzz -DCMAKE_CXX_COMPILER=clang++ -DCMAKE_BUILD_TY
 mkdir -p "$root/build/fuzz/corpus"
 "$root/build/fuzz/tests/fuzz/fuzz_loadstring" -max_total_time=60 -timeout=10 -rss_limit_mb=2048 \
   -artifact_prefix="$root/build/fuzz/" -print_final_stats=1 "$root/build/fuzz/corpus" "$root/tests/fuzz/corpus"
-echo "fuzz: 1 passed, 0 failed"
+
+bash "$root/scripts/build.sh" tsan -DCMAKE_BUILD_TYPE=Debug -DOECORE_SANITIZE=thread \
+  -DOECORE_BUILD_BENCHMARKS=OFF -- --target test_core_concurrency
+TSAN_OPTIONS=halt_on_error=1 ctest --test-dir "$root/build/tsan" -L concurrency --output-on-failure
