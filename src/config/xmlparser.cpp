@@ -151,23 +151,35 @@ OmbRef<OmbRefCnt> OmbXmlParser::parseMarkupExtension(OmbXmlParserContext& contex
     return context.createInstance(&extension);
 }
 
+namespace {
+
+// Loads through a new context and keeps the document's comment.
+template <class Load>
+OmbRef<OmbConfiguration> loadWithContext(const OmbRef<OmbConfigurationParameters>& params,
+                                         OmbDataSetInitialization datasetInitialization,
+                                         const OmbRef<OmbResourceResolver>& resolver, Load load) {
+    OmbXmlParserContext context(params, datasetInitialization, resolver);
+    OmbRef<OmbConfiguration> configuration = load(context);
+    configuration->storeComment(context.comment());
+    return configuration;
+}
+
+}  // namespace
+
 OmbRef<OmbConfiguration> OmbXmlParser::loadFile(const OmbString& fileName,
                                                 const OmbRef<OmbConfigurationParameters>& params,
                                                 OmbDataSetInitialization datasetInitialization,
                                                 const OmbRef<OmbResourceResolver>& resolver) {
-    OmbXmlParserContext context(params, datasetInitialization, resolver);
-    OmbRef<OmbConfiguration> configuration = context.loadFile(fileName);
-    configuration->storeComment(context.comment());
-    return configuration;
+    return loadWithContext(params, datasetInitialization, resolver,
+                           [&](OmbXmlParserContext& context) { return context.loadFile(fileName); });
 }
 
 OmbRef<OmbConfiguration> OmbXmlParser::loadString(const OmbString& text,
                                                   const OmbRef<OmbConfigurationParameters>& params,
                                                   OmbDataSetInitialization datasetInitialization,
                                                   const OmbRef<OmbResourceResolver>& resolver) {
-    OmbXmlParserContext context(params, datasetInitialization, resolver);
-    OmbRef<OmbConfiguration> configuration = context.loadString(text);
-    configuration->storeComment(context.comment());
-    return configuration;
+    return loadWithContext(params, datasetInitialization, resolver,
+                           [&](OmbXmlParserContext& context) { return context.loadString(text); });
 }
+
 void (*OmbXmlParser::initializeDataSet)(OmbRefCnt&) = nullptr;

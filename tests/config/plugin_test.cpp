@@ -6,6 +6,8 @@
 
 #include <dlfcn.h>
 
+#include "../errortext.h"
+
 #include <cstdlib>
 #include <string>
 
@@ -16,15 +18,6 @@ OmbRef<OmbConfiguration> loadPluginDocument() {
                                               "<TestPluginObject Name='P' Public='true' Value='42'/>"
                                               "</Configuration>"),
                                     {}, OmbDataSetInitialization::Delayed, {});
-}
-
-std::string errorOf(const std::function<void()>& f) {
-    try {
-        f();
-    } catch (const OmbException& e) {
-        return std::string(e.asString().view());
-    }
-    return "no error";
 }
 
 }  // namespace

@@ -11,6 +11,7 @@
 #include <string>
 
 #include "../core/tempdir.h"
+#include "../errortext.h"
 #include "testclasses.h"
 
 namespace {
@@ -29,15 +30,6 @@ OmbRef<OmbConfiguration> load(const std::string& body,
 template <class T>
 OmbRef<T> publicObject(const OmbRef<OmbConfiguration>& c, const char* name) {
     return omb_dynamic_cast<T>(c->getPublicObject(OmbString(name)));
-}
-
-std::string errorOf(const std::function<void()>& f) {
-    try {
-        f();
-    } catch (const OmbException& e) {
-        return std::string(e.asString().view());
-    }
-    return "no error";
 }
 
 std::string loadError(const std::string& body) {

@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "../errortext.h"
 #include "tempdir.h"
 
 namespace {
@@ -115,12 +116,7 @@ TEST(RollingFileLogAppender, AppendsToAnExistingFileAndCreatesItsDirectory) {
 TEST(RollingFileLogAppender, BadArgumentsSayWhat) {
     TempDir dir;
     auto message = [](const std::string& name, unsigned count) {
-        try {
-            OmbRollingFileLogAppender(OmbString(name), count, 100);
-        } catch (const OmbXArgument& e) {
-            return std::string(e.asString().view());
-        }
-        return std::string("no exception");
+        return errorOf([&] { OmbRollingFileLogAppender(OmbString(name), count, 100); });
     };
     EXPECT_EQ(message((dir / "x.log").string(), 0),
               "Invalid argument in Number of log files must be greater than zero..");

@@ -3,16 +3,9 @@
 
 #include <gtest/gtest.h>
 
-namespace {
+#include "../errortext.h"
 
-std::string misuse(const std::function<void()>& f) {
-    try {
-        f();
-    } catch (const OmbXInvalidOperation& e) {
-        return std::string(e.asString().view());
-    }
-    return "no exception";
-}
+namespace {
 
 const std::string ownsWriter = "The current thread already owns the writer lock.";
 const std::string ownsReader = "The current thread already owns a reader lock.";
@@ -22,16 +15,16 @@ const std::string ownsReader = "The current thread already owns a reader lock.";
 TEST(ReaderWriterLock, NonRecursiveFormsRefuseToReenter) {
     OmbRef<OmbReaderWriterLock> lock(new OmbReaderWriterLock);
     lock->acquireReaderLock();
-    EXPECT_EQ(misuse([&] { lock->acquireReaderLock(); }), ownsReader);
-    EXPECT_EQ(misuse([&] { lock->acquireWriterLock(); }), ownsReader) << "no upgrade from read to write";
-    EXPECT_EQ(misuse([&] { lock->acquireRecursiveWriterLock(); }), ownsReader);
+    EXPECT_EQ(errorOf([&] { lock->acquireReaderLock(); }), ownsReader);
+    EXPECT_EQ(errorOf([&] { lock->acquireWriterLock(); }), ownsReader) << "no upgrade from read to write";
+    EXPECT_EQ(errorOf([&] { lock->acquireRecursiveWriterLock(); }), ownsReader);
     lock->releaseReaderLock();
 
     lock->acquireWriterLock();
     EXPECT_TRUE(lock->hasWriterLock());
-    EXPECT_EQ(misuse([&] { lock->acquireWriterLock(); }), ownsWriter);
-    EXPECT_EQ(misuse([&] { lock->acquireReaderLock(); }), ownsWriter);
-    EXPECT_EQ(misuse([&] { lock->acquireRecursiveReaderLock(); }), ownsWriter);
+    EXPECT_EQ(errorOf([&] { lock->acquireWriterLock(); }), ownsWriter);
+    EXPECT_EQ(errorOf([&] { lock->acquireReaderLock(); }), ownsWriter);
+    EXPECT_EQ(errorOf([&] { lock->acquireRecursiveReaderLock(); }), ownsWriter);
     lock->releaseWriterLock();
     EXPECT_FALSE(lock->hasWriterLock());
 }
@@ -41,7 +34,7 @@ TEST(ReaderWriterLock, RecursiveFormsCountTheirReleases) {
     lock->acquireRecursiveReaderLock();
     lock->acquireRecursiveReaderLock();
     lock->releaseReaderLock();
-    EXPECT_EQ(misuse([&] { lock->acquireWriterLock(); }), ownsReader) << "one read lock is still held";
+    EXPECT_EQ(errorOf([&] { lock->acquireWriterLock(); }), ownsReader) << "one read lock is still held";
     lock->releaseReaderLock();
     lock->acquireWriterLock();  // free again
     lock->acquireRecursiveWriterLock();
