@@ -196,7 +196,9 @@ OmbRef<OmbConfiguration> OmbXmlParserContext::loadFile(const OmbString& fileName
         return shared;
     if (const auto it = loaded_.find(absolute); it != loaded_.end()) return it->second;
 
-    std::ifstream in(path, std::ios::binary);
+    // Only regular files: a device such as /dev/zero would be read forever.
+    std::ifstream in;
+    if (fs::is_regular_file(path, error)) in.open(path, std::ios::binary);
     if (!in) OMB_THROW(XmlParserError, OmbString("Failed to open file: ") + absolute);
     std::ostringstream text;
     text << in.rdbuf();

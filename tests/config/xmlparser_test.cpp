@@ -288,6 +288,9 @@ TEST(XmlParser, FilesResolveRelativeToTheirFolderAndRestoreTheCurrentDirectory) 
                                          {});
               }),
               "Failed to open file: " + (dir / "none.px").string());
+    EXPECT_EQ(
+        errorOf([&] { OmbXmlParser::loadFile(OmbString("/dev/zero"), {}, OmbDataSetInitialization::Delayed, {}); }),
+        "Failed to open file: /dev/zero");
     dir.write("bad.px", "<Configuration Namespace='x'>");
     EXPECT_EQ(errorOf([&] {
                   OmbXmlParser::loadFile(OmbString((dir / "bad.px").string()), {}, OmbDataSetInitialization::Delayed,
