@@ -199,7 +199,7 @@ OmbRef<OmbConfiguration> OmbXmlParserContext::loadFile(const OmbString& fileName
     // Only regular files: a device such as /dev/zero would be read forever.
     std::ifstream in;
     if (fs::is_regular_file(path, error)) in.open(path, std::ios::binary);
-    if (!in) OMB_THROW(XmlParserError, OmbString("Failed to open file: ") + absolute);
+    if (!in.is_open()) OMB_THROW(XmlParserError, OmbString("Failed to open file: ") + absolute);
     std::ostringstream text;
     text << in.rdbuf();
     in.close();
