@@ -92,6 +92,7 @@ std::vector<std::unique_ptr<ClassMetaData>> coreMetaData() {
     for (const OmbClassDescription::CollectionType& type : OmbClassDescription::collectionTypes())
         out.push_back(std::make_unique<DescribedCollectionMetaData>(type));
     for (auto& extension : markupExtensionMetaData()) out.push_back(std::move(extension));
+    for (const auto create : libraryClasses()) out.push_back(create());
     return out;
 }
 

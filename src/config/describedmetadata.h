@@ -4,6 +4,7 @@
 
 #include <oecore/config/classdescription.h>
 #include <oecore/config/classmetadata.h>
+#include <oecore/config/xmlparser.h>
 
 #include <memory>
 #include <vector>
@@ -35,5 +36,9 @@ private:
 
 // The metadata of the library's own classes, for one context.
 std::vector<std::unique_ptr<ClassMetaData>> coreMetaData();
+
+// What the library's subsystems registered through OmbXmlParser.
+std::vector<std::unique_ptr<ClassMetaData> (*)()>& libraryClasses();
+std::vector<std::pair<OmbString, OmbTypeConverter>>& libraryTypeConverters();
 
 }  // namespace oecore::detail

@@ -25,6 +25,28 @@ struct OmbXmlParserContext::Plugin {
     std::unique_ptr<OmbPluginInstance> instance;
 };
 
+namespace oecore::detail {
+
+std::vector<std::unique_ptr<ClassMetaData> (*)()>& libraryClasses() {
+    static std::vector<std::unique_ptr<ClassMetaData> (*)()> classes;
+    return classes;
+}
+
+std::vector<std::pair<OmbString, OmbTypeConverter>>& libraryTypeConverters() {
+    static std::vector<std::pair<OmbString, OmbTypeConverter>> converters;
+    return converters;
+}
+
+}  // namespace oecore::detail
+
+void OmbXmlParser::registerLibraryClass(std::unique_ptr<ClassMetaData> (*create)()) {
+    oecore::detail::libraryClasses().push_back(create);
+}
+
+void OmbXmlParser::registerLibraryTypeConverter(const char* typeName, OmbTypeConverter converter) {
+    oecore::detail::libraryTypeConverters().emplace_back(OmbString::literal(typeName), std::move(converter));
+}
+
 namespace {
 
 constexpr std::uint32_t engineVersion = 0x05040003;
@@ -321,6 +343,8 @@ void OmbXmlParserContext::loadPluginByName(const OmbString& name) {
         }
         for (const OmbEnumDescription* e : OmbEnumDescription::all())
             registerTypeConverter(e->typeName(), enumConverter(*e));
+        for (const auto& [typeName, converter] : oecore::detail::libraryTypeConverters())
+            registerTypeConverter(typeName, converter);
     } else {
         plugin->instance = oecore::detail::loadPluginModule(name);
         plugin->instance->registerClasses(*this);

@@ -56,6 +56,7 @@ struct RuntimeState {
     std::atomic<int> globalCacheSize{300};
     std::array<PredefinedClassFunctions, static_cast<std::size_t>(OmbRuntime::PredefinedClass::Count)>
         predefinedClasses;
+    std::array<PredefinedClassFunctions, static_cast<std::size_t>(OmbRuntime::Service::Count)> services;
 };
 
 RuntimeState& state() {
@@ -93,6 +94,14 @@ void startFileLog(const OmbString& fileName) {
     OmbLog::addAppender(OmbRef<OmbLogAppender>(new OmbRollingFileLogAppender(fileName, fileCount, maximumFileSize)));
     OmbLog::forceLogLevel(OmbLogAll, true);
     OmbLog::info("Adding file logger and forcing log level to ALL.");
+}
+
+void startService(OmbRuntime::Service service) {
+    if (const auto init = state().services[static_cast<std::size_t>(service)].create) init();
+}
+
+void stopService(OmbRuntime::Service service) {
+    if (const auto cleanUp = state().services[static_cast<std::size_t>(service)].drop) cleanUp();
 }
 
 void checkFloatingPointPrecision() {
@@ -138,7 +147,9 @@ void OmbRuntime::init() {
         }
     }
     checkFloatingPointPrecision();
+    startService(Service::BlockPool);
     s.configurationLock = OmbRef<OmbReaderWriterLock>(new OmbReaderWriterLock);
+    startService(Service::Atoms);
     OmbLog::info("Creating predefined objects");
     for (const PredefinedClassFunctions& cls : s.predefinedClasses)
         if (cls.create) cls.create();
@@ -167,6 +178,9 @@ void OmbRuntime::shutdown() {
     OmbLog::info("Releasing registered objects");
     empty(s.registered);
     OmbGlobalCache::destroy();
+    stopService(Service::GdalAccess);
+    stopService(Service::Atoms);
+    stopService(Service::BlockPool);
     {
         std::lock_guard lock(s.apisMutex);
         s.apis.clear();
@@ -234,6 +248,10 @@ OmbRef<OmbEngineObject> OmbRuntime::getSharedConfig(const OmbString& name) {
 
 void OmbRuntime::registerPredefinedClass(PredefinedClass cls, void (*create)(), void (*drop)()) {
     state().predefinedClasses.at(static_cast<std::size_t>(cls)) = {create, drop};
+}
+
+void OmbRuntime::registerService(Service service, void (*init)(), void (*cleanUp)()) {
+    state().services.at(static_cast<std::size_t>(service)) = {init, cleanUp};
 }
 
 void OmbRuntime::registerAPI(const OmbString& name, ApiFunction initialize, ApiFunction second, ApiFunction shutdown) {

@@ -185,6 +185,11 @@ public:
     // Throws the reader's error for an element: its Name, the text, its position.
     [[noreturn]] static void fail(const TiXmlNode* node, const OmbString& text);
 
+    // Hand-written metadata and type converters of the library's own
+    // subsystems, registered with every context like the described classes.
+    static void registerLibraryClass(std::unique_ptr<ClassMetaData> (*create)());
+    static void registerLibraryTypeConverter(const char* typeName, OmbTypeConverter converter);
+
     // Called for every object read while data sets are initialised
     // immediately; the data set subsystem installs it.
     static void (*initializeDataSet)(OmbRefCnt& object);

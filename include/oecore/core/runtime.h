@@ -100,6 +100,13 @@ public:
     // and drop its static references to them at shutdown().
     static void registerPredefinedClass(PredefinedClass cls, void (*create)(), void (*drop)());
 
+    // Process-wide services of other subsystems that the runtime starts and
+    // cleans up at fixed points: the block pool before the configuration
+    // lock, the atom table before the predefined objects; at shutdown GDAL
+    // access, atoms and the block pool, in that order, after the cache.
+    enum class Service { BlockPool, Atoms, GdalAccess, Count };
+    static void registerService(Service service, void (*init)(), void (*cleanUp)());
+
     using ApiFunction = void (*)();
     // Initialises the runtime, then stores the API's functions (replacing
     // those of an API with the same name). An API registered while the
