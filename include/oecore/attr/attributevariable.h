@@ -276,9 +276,10 @@ private:
 };
 
 // Every value type has its instances in the library.
-#define OMB_ATTRIBUTE_VARIABLE_TYPES(X)                                                                      \
-    X(std::int64_t)                                                                                          \
-    X(double) X(bool) X(OmbString) X(OmbColor) X(OmbAlignX) X(OmbAlignY) X(OmbShape) X(OmbEdgesToSegmentize) \
+#define OMB_ATTRIBUTE_VARIABLE_TYPES(X)                                                            \
+    X(std::int64_t)                                                                                \
+    X(double)                                                                                      \
+    X(bool) X(OmbString) X(OmbColor) X(OmbAlignX) X(OmbAlignY) X(OmbShape) X(OmbEdgesToSegmentize) \
         X(OmbPickingSupport) X(OmbVisualizerLengthUnit)
 
 #define OMB_EXTERN_ATTRIBUTE_VARIABLE(T)                   \
