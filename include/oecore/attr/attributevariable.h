@@ -276,11 +276,11 @@ private:
 };
 
 // Every value type has its instances in the library.
-#define OMB_ATTRIBUTE_VARIABLE_TYPES(X)                                                            \
-    X(std::int64_t)                                                                                \
-    X(double)                                                                                      \
-    X(bool) X(OmbString) X(OmbColor) X(OmbAlignX) X(OmbAlignY) X(OmbShape) X(OmbEdgesToSegmentize) \
-        X(OmbPickingSupport) X(OmbVisualizerLengthUnit)
+// clang-format off
+#define OMB_ATTRIBUTE_VARIABLE_TYPES(X) \
+    X(std::int64_t) X(double) X(bool) X(OmbString) X(OmbColor) \
+    X(OmbAlignX) X(OmbAlignY) X(OmbShape) X(OmbEdgesToSegmentize) X(OmbPickingSupport) X(OmbVisualizerLengthUnit)
+// clang-format on
 
 #define OMB_EXTERN_ATTRIBUTE_VARIABLE(T)                   \
     extern template class OmbKeyValueTable<T>;             \
