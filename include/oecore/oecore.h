@@ -34,6 +34,16 @@
 #include <oecore/core/unicodeutils.h>
 #include <oecore/core/vec.h>
 
+#include <oecore/attr/atoms.h>
+#include <oecore/attr/attributeset.h>
+#include <oecore/attr/attributesetlist.h>
+#include <oecore/attr/attributevalue.h>
+#include <oecore/attr/attributevariable.h>
+#include <oecore/attr/color.h>
+#include <oecore/attr/featureattribute.h>
+#include <oecore/attr/undefinedvalue.h>
+#include <oecore/attr/visenums.h>
+
 #include <oecore/config/boxedvalue.h>
 #include <oecore/config/classdescription.h>
 #include <oecore/config/classmetadata.h>

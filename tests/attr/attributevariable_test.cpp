@@ -1,8 +1,11 @@
 #include <oecore/attr/attributevariable.h>
+#include <oecore/attr/featureattribute.h>
+#include <oecore/attr/undefinedvalue.h>
 #include <oecore/core/exception.h>
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <random>
 
 #include "../errortext.h"
@@ -140,4 +143,26 @@ TEST(Color, ParserGrammar) {
         EXPECT_FALSE(OmbColor::fromString(OmbString(bad), untouched)) << bad;
         EXPECT_EQ(untouched, OmbColor(9, 9, 9));
     }
+}
+
+TEST(UndefinedValue, IntegersAndFloatsMarkTheirNoDataValue) {
+    const OmbUndefinedIntValue minus9999(OmbUndefinedIntValueParams{-9999});
+    EXPECT_TRUE(minus9999.isInt());
+    EXPECT_TRUE(minus9999.isUndefined(-9999));
+    EXPECT_FALSE(minus9999.isUndefined(0));
+    EXPECT_FALSE(minus9999.isUndefined(-9999.0f)) << "a float is never an integer's no-data value";
+    const OmbUndefinedFloatValue nan(std::nanf(""));
+    EXPECT_TRUE(nan.isFloat());
+    EXPECT_FALSE(nan.isUndefined(std::nanf(""))) << "a NaN no-data value marks nothing";
+    EXPECT_TRUE(OmbUndefinedFloatValue(1.5f).isUndefined(1.5f));
+}
+
+TEST(FeatureAttributeSchema, ListsEachKeyAndTypeOnce) {
+    OmbRef<OmbFeatureAttributeSchema> schema(new OmbFeatureAttributeSchema);
+    schema->add(value, OmbAttributeDouble);
+    schema->add(value, OmbAttributeDouble);
+    schema->add(value, OmbAttributeString);
+    EXPECT_EQ(schema->attributes()->size(), 2u);
+    EXPECT_TRUE(schema->contains(value));
+    EXPECT_LT(*schema->attributes()->get(0), *schema->attributes()->get(1));
 }

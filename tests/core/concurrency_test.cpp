@@ -1,6 +1,7 @@
 // Races on reference counts, weak records, strings, class ids, the
 // configuration lock, abort requests and the cache collector. Run under
 // ThreadSanitizer and AddressSanitizer, these catch what a plain run cannot.
+#include <oecore/attr/attributeset.h>
 #include <oecore/core/abort.h>
 #include <oecore/core/globalcache.h>
 #include <oecore/core/readerwriterlock.h>
@@ -181,4 +182,36 @@ TEST(Concurrency, TheCollectorStopsCleanlyWhileCollectionsAreRequested) {
         OmbGlobalCache::destroy();
     }
     OmbRuntime::globalCacheSize(300);
+}
+
+TEST(Concurrency, AtomsInternedFromManyThreadsGetOneNumberPerString) {
+    std::vector<OmbAtom> seen[4];
+    together(4, [&](int t) {
+        for (int i = 0; i < 500; ++i) seen[t].push_back(OmbAtoms::atom(OmbString("concurrent-" + std::to_string(i))));
+    });
+    for (int t = 1; t < 4; ++t) EXPECT_EQ(seen[t], seen[0]);
+    EXPECT_EQ(std::set<OmbAtom>(seen[0].begin(), seen[0].end()).size(), 500u);
+}
+
+TEST(Concurrency, ClonesAreReadWhileAnotherCloneIsWritten) {
+    const OmbAtom depth = OmbAtoms::atom(OmbString("depth"));
+    OmbRef<OmbAttributeSet> original(new OmbAttributeSet);
+    for (int i = 0; i < 8; ++i) original->set(OmbAtoms::atom(OmbString("a" + std::to_string(i))), std::int64_t{i});
+    original->set(depth, 1.0);
+    std::vector<OmbRef<OmbAttributeSet>> clones;
+    for (int t = 0; t < 4; ++t) clones.emplace_back(original->clone());
+    together(4, [&](int t) {
+        for (int i = 0; i < 2000; ++i) {
+            if (t == 0) {
+                clones[0]->set(depth, static_cast<double>(i));  // copies the shared table once
+            } else {
+                double d = 0;
+                ASSERT_TRUE(clones[t]->get(depth, d));
+                ASSERT_EQ(d, 1.0);
+            }
+        }
+    });
+    double d = 0;
+    EXPECT_TRUE(original->get(depth, d));
+    EXPECT_EQ(d, 1.0);
 }
