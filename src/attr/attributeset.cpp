@@ -13,7 +13,7 @@ const OmbAtomConstant OmbAttributeSet::geoTypeKey("geoType");
 
 // The storage: a count of the sets sharing it, the capacity, the used slots
 // and the slots themselves, in one block.
-struct OmbAttributeSet::Table {
+struct alignas(alignof(OmbAttributeSet::Slot)) OmbAttributeSet::Table {
     std::atomic<int> refs{1};
     std::uint32_t capacity;
     std::uint32_t count = 0;
@@ -50,6 +50,7 @@ struct OmbAttributeSet::Table {
 };
 
 static_assert(alignof(OmbAttributeSet::Slot) <= alignof(std::max_align_t));
+static_assert(sizeof(OmbAttributeSet::Table) % alignof(OmbAttributeSet::Slot) == 0, "slots follow the header aligned");
 
 OmbAttributeSet::OmbAttributeSet(std::uint32_t capacity) : table_(Table::create(capacity ? capacity : 8)) {}
 

@@ -9,6 +9,7 @@
 
 #include <cstdio>
 #include <filesystem>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -131,7 +132,10 @@ void Omb_describedToXml(const OmbEngineObject& object, OmbXmlSerializer& seriali
                         TiXmlElement* parent, const char* propertyName, const char*, bool isPublic) {
     if (serializer.predefinedToXml(object, topLevel, parent, propertyName, isPublic)) return;
     const OmbClassDescription* description = OmbClassDescription::of(object.myRuntimeClass());
-    auto* element = new TiXmlElement(object.myRuntimeClassName());
+    // Owned here until it joins the document: a property that fails to write
+    // must not leak it.
+    std::unique_ptr<TiXmlElement> owned(new TiXmlElement(object.myRuntimeClassName()));
+    TiXmlElement* element = owned.get();
     if (parent) {
         element->SetAttribute("Name", "");
         serializer.addReference(OmbXmlSerializer::addReferenceElement(topLevel, parent, propertyName), element);
@@ -163,7 +167,7 @@ void Omb_describedToXml(const OmbEngineObject& object, OmbXmlSerializer& seriali
     if (isPublic) element->SetAttribute("Public", "true");
     // Names given through properties are noted now that they are written.
     serializer.addObject(&object, element);
-    topLevel->LinkEndChild(element);
+    topLevel->LinkEndChild(owned.release());
 }
 
 namespace oecore::detail {
