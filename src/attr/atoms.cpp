@@ -67,9 +67,10 @@ OmbString OmbAtoms::name(OmbAtom atom) {
 
 bool OmbAtoms::isAtomString(const OmbString& text) { return !text.empty() && text.dataUtf8()[0] == '#'; }
 
-void OmbAtoms::init() {
-    OmbLog::info("Initializing atom table");
-    AtomTable& t = table();
+namespace {
+
+// Forgets every atom but the constants; the next ones follow the highest.
+void keepOnlyConstants(AtomTable& t) {
     std::lock_guard lock(t.mutex);
     t.byName = t.constants;
     t.byAtom.clear();
@@ -77,13 +78,16 @@ void OmbAtoms::init() {
     t.next = t.highestConstant + 1;
 }
 
+}  // namespace
+
+void OmbAtoms::init() {
+    OmbLog::info("Initializing atom table");
+    keepOnlyConstants(table());
+}
+
 void OmbAtoms::cleanUp() {
     OmbLog::info("Destroying atom table");
-    AtomTable& t = table();
-    std::lock_guard lock(t.mutex);
-    t.byName = t.constants;
-    t.byAtom.clear();
-    for (const auto& [name, atom] : t.constants) t.byAtom.emplace(atom, name);
+    keepOnlyConstants(table());
 }
 
 // The runtime keeps the constants and forgets the other atoms at each start.

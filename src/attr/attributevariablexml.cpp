@@ -21,10 +21,7 @@
 namespace {
 
 OmbString text(OmbXmlParserContext& context, TiXmlElement* element, const char* property) {
-    const OmbRef<OmbRefCnt> value = OmbXmlParser::parsePropertyGeneric(context, element, OmbString::literal(property),
-                                                                       OmbString::literal("String"), false);
-    const auto* boxed = dynamic_cast<const OmbBoxedValue<OmbString>*>(value.get());
-    return boxed ? boxed->value() : OmbString();
+    return OmbXmlParser::getStringProperty(context, element, property);
 }
 
 [[noreturn]] void conversionFailed(TiXmlElement* element, const OmbString& value, const char* type) {

@@ -19,10 +19,7 @@ namespace {
 
 // The text of a String property of the extension's element.
 OmbString text(OmbXmlParserContext& context, TiXmlElement* element, const char* property) {
-    const OmbRef<OmbRefCnt> value = OmbXmlParser::parsePropertyGeneric(context, element, OmbString::literal(property),
-                                                                       OmbString::literal("String"), false);
-    const auto* boxed = dynamic_cast<const OmbBoxedValue<OmbString>*>(value.get());
-    return boxed ? boxed->value() : OmbString();
+    return OmbXmlParser::getStringProperty(context, element, property);
 }
 
 bool flag(OmbXmlParserContext& context, TiXmlElement* element, const char* property) {

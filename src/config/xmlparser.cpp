@@ -75,9 +75,14 @@ bool OmbXmlParser::isMarkupExtensionAttribute(const OmbString& text) {
 }
 
 OmbString OmbXmlParser::getInstanceName(OmbXmlParserContext& context, TiXmlElement* element) {
-    const OmbRef<OmbRefCnt> name =
-        parsePropertyGeneric(context, element, OmbString::literal("Name"), OmbString::literal("String"), false);
-    const auto* text = dynamic_cast<const OmbBoxedValue<OmbString>*>(name.get());
+    return getStringProperty(context, element, "Name");
+}
+
+OmbString OmbXmlParser::getStringProperty(OmbXmlParserContext& context, TiXmlElement* element,
+                                          const char* propertyName) {
+    const OmbRef<OmbRefCnt> value =
+        parsePropertyGeneric(context, element, OmbString::literal(propertyName), OmbString::literal("String"), false);
+    const auto* text = dynamic_cast<const OmbBoxedValue<OmbString>*>(value.get());
     return text ? text->value() : OmbString();
 }
 

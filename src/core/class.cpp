@@ -1,6 +1,9 @@
 #include <oecore/core/class.h>
+#include <oecore/core/engineobject.h>
 
 #include <mutex>
+#include <set>
+#include <string>
 
 namespace {
 
@@ -62,4 +65,11 @@ OmbString pluginLibName(const OmbString& name) {
     for (const PluginRow* row = pluginTable; row->id != 0; ++row)
         if (name == OmbString::literal(row->name)) return OmbString::literal(row->module);
     return OmbString();
+}
+
+const char* Omb_templateClassName(const char* kind, const char* argument) {
+    static std::mutex mutex;
+    static std::set<std::string> names;
+    std::lock_guard lock(mutex);
+    return names.insert(std::string(kind) + "<" + argument + ">").first->c_str();
 }

@@ -23,7 +23,9 @@ OMB_DESCRIBE_CLASS(TestPluginObject) {
 }
 
 // How often a context let go of the module's classes; the tests read it.
-extern "C" int testPluginUnregistered = 0;
+extern "C" {
+int testPluginUnregistered = 0;
+}
 
 namespace {
 

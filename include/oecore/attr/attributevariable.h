@@ -76,6 +76,9 @@ private:
 // An ordered map from attribute values to T. All keys have one type.
 template <class T>
 class OmbKeyValueTable : public OmbEngineObject {
+    OMB_ENGINE_CLASS_INLINE(OmbEngineObject,
+                            Omb_templateClassName("KeyValueTable", OmbAttributeVariableTraits<T>::name()), 0)
+
 public:
     using Map = std::map<OmbAttributeValue, T>;
 
@@ -84,16 +87,6 @@ public:
         : OmbEngineObject(other), map_(other.map_), keyType_(other.keyType_) {}
 
     OmbKeyValueTable* clone() const override { return new OmbKeyValueTable(*this); }
-    const char* myRuntimeClassName() const override { return "KeyValueTable"; }
-    static int classId() {
-        static int id = 0;
-        return initClassId(id);
-    }
-    static OmbClass* runtimeClass() {
-        static const std::string name = std::string("KeyValueTable<") + OmbAttributeVariableTraits<T>::name() + ">";
-        static OmbClass record(OmbEngineObject::runtimeClass(), 0, name.c_str());
-        return &record;
-    }
 
     // Throws OmbXInconsistentKeyTypes for a key of another type.
     void add(const OmbAttributeValue& key, const T& value);
@@ -117,9 +110,6 @@ public:
     OmbKeyValueTableNotifier& notifier() noexcept { return notifier_; }
 
 private:
-    int myClassId_() const override { return classId(); }
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }
-
     Map map_;
     OmbAttributeSetType keyType_ = OmbAttributeEmpty;
     OmbKeyValueTableNotifier notifier_;
@@ -157,24 +147,8 @@ private:
 };
 
 // The members every attribute variable class template declares.
-#define OMB_ATTRIBUTE_VARIABLE_CLASS(KIND)                                                                   \
-public:                                                                                                      \
-    static int classId() {                                                                                   \
-        static int id = 0;                                                                                   \
-        return OmbEngineObject::initClassId(id);                                                             \
-    }                                                                                                        \
-    static OmbClass* runtimeClass() {                                                                        \
-        static const std::string name = std::string(KIND "<") + OmbAttributeVariableTraits<T>::name() + ">"; \
-        static OmbClass record(OmbEngineObject::runtimeClass(), 0, name.c_str());                            \
-        return &record;                                                                                      \
-    }                                                                                                        \
-    const char* myRuntimeClassName() const override { return runtimeClass()->name(); }                       \
-                                                                                                             \
-private:                                                                                                     \
-    int myClassId_() const override { return classId(); }                                                    \
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }                                    \
-                                                                                                             \
-public:
+#define OMB_ATTRIBUTE_VARIABLE_CLASS(KIND) \
+    OMB_ENGINE_CLASS_INLINE(OmbEngineObject, Omb_templateClassName(KIND, OmbAttributeVariableTraits<T>::name()), 0)
 
 template <class T>
 class OmbDirectAttributeVariable : public OmbAttributeVariable<T> {

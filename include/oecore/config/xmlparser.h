@@ -167,6 +167,8 @@ public:
                                                   const OmbString& propertyName, const OmbString& typeName,
                                                   bool isContent);
     static OmbString getInstanceName(OmbXmlParserContext& context, TiXmlElement* element);
+    // A String property's text; empty when absent.
+    static OmbString getStringProperty(OmbXmlParserContext& context, TiXmlElement* element, const char* propertyName);
     static OmbRef<OmbRefCnt> parseCollection(OmbXmlParserContext& context, TiXmlElement* element,
                                              const OmbString& typeName,
                                              const std::function<bool(const TiXmlNode*)>& filter);

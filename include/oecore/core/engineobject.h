@@ -68,24 +68,28 @@ public:
     [[maybe_unused]] static const OmbClass* const CLASS##RuntimeClassAtLoad = CLASS::runtimeClass();
 
 // The same members defined in the class body, for templates and classes that
-// live in one header.
-#define OMB_ENGINE_CLASS_INLINE(BASE, ELEMENT, PLUGIN)                    \
-public:                                                                   \
-    static int classId() {                                                \
-        static int id = 0;                                                \
-        return OmbEngineObject::initClassId(id);                          \
-    }                                                                     \
-    static OmbClass* runtimeClass() {                                     \
-        static OmbClass record(BASE::runtimeClass(), PLUGIN, ELEMENT);    \
-        return &record;                                                   \
-    }                                                                     \
-    const char* myRuntimeClassName() const override { return ELEMENT; }   \
-                                                                          \
-private:                                                                  \
-    int myClassId_() const override { return classId(); }                 \
-    OmbClass* myRuntimeClass_() const override { return runtimeClass(); } \
-                                                                          \
+// live in one header. ELEMENT may be any expression giving a lasting name.
+#define OMB_ENGINE_CLASS_INLINE(BASE, ELEMENT, PLUGIN)                                 \
+public:                                                                                \
+    static int classId() {                                                             \
+        static int id = 0;                                                             \
+        return OmbEngineObject::initClassId(id);                                       \
+    }                                                                                  \
+    static OmbClass* runtimeClass() {                                                  \
+        static OmbClass record(BASE::runtimeClass(), PLUGIN, ELEMENT);                 \
+        return &record;                                                                \
+    }                                                                                  \
+    const char* myRuntimeClassName() const override { return runtimeClass()->name(); } \
+                                                                                       \
+private:                                                                               \
+    int myClassId_() const override { return classId(); }                              \
+    OmbClass* myRuntimeClass_() const override { return runtimeClass(); }              \
+                                                                                       \
 public:
+
+// "KIND<ARGUMENT>", kept for the life of the process: the element names of
+// class template instances.
+const char* Omb_templateClassName(const char* kind, const char* argument);
 
 class OmbEngineObject : public OmbWRefCnt {
 public:
