@@ -40,6 +40,8 @@
 #include <oecore/attr/attributevalue.h>
 #include <oecore/attr/attributevariable.h>
 #include <oecore/attr/color.h>
+#include <oecore/attr/condition.h>
+#include <oecore/attr/expression.h>
 #include <oecore/attr/featureattribute.h>
 #include <oecore/attr/undefinedvalue.h>
 #include <oecore/attr/visenums.h>
