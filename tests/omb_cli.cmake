@@ -49,3 +49,11 @@ file(WRITE ${px_dir}/broken.px "<Configuration Namespace='Demo'>\n  <TestPluginO
 expect("info;${px_dir}/broken.px" 1 "broken.px: Failed to convert 'many' to type int. Row 2, Column 3.")
 expect("info;${px_dir}/missing.px" 1 "Failed to open file: ")
 expect("resave;${px_dir}/demo.px" 2 "resave takes 2 file names")
+
+# Expressions against attributes given as literals.
+expect("expr;class = 2 and not bridge;class=2;bridge=false" 0 "^true \\(bool\\)")
+expect("expr;substr(name, 5);name=\"Main Road\"" 0 "\"Road\" \\(String\\)")
+expect("expr;depth * 2;depth=-1.5" 0 "-3 \\(double\\)")
+expect("expr;missing + 1" 0 "null")
+expect("expr;class = = 2" 1 "Unexpected token\n  class = = 2\n          \\^")
+expect("expr;a;a=harbour" 2 "'a=harbour' is not NAME=VALUE with a literal value")

@@ -17,6 +17,9 @@ void printHelp(std::ostream& out) {
            "  info FILE.px           load a configuration and list its public objects\n"
            "  classes                list the registered engine classes with their class records\n"
            "  resave FILE.px OUT.px  load a configuration and save its public objects again\n"
+           "  expr 'EXPRESSION' [NAME=VALUE]...\n"
+           "                         evaluate an expression against attributes given as literals\n"
+           "                         (3, 2.5, \"text\", #atom, true), printing the value and its type\n"
            "\n"
            "Options:\n"
            "  --param KEY=VALUE  a configuration parameter for ConfigurationParameter (repeatable)\n"
@@ -117,7 +120,59 @@ bool expectFiles(const Options& options, std::size_t count) {
     return false;
 }
 
+// A literal of the expression language (a negative number included).
+bool literal(const std::string& text, OmbAttributeValue& value) {
+    try {
+        const OmbRef<OmbExpression> e = OmbExpression::parse(OmbString(text));
+        const bool constant = e->type() == OmbExpression::Constant ||
+                              (e->type() == OmbExpression::Negate && e->child(0)->type() == OmbExpression::Constant);
+        return constant && e->evaluate(OmbReadOnlyAttributes(), value);
+    } catch (const OmbXExpressionParseError&) {
+        return false;
+    }
+}
+
+int evaluateExpression(const Options& options) {
+    if (options.files.empty()) {
+        std::cerr << "omb: expr takes an expression; see 'omb --help'\n";
+        return 2;
+    }
+    OmbRef<OmbAttributeSet> attributes(new OmbAttributeSet);
+    for (std::size_t i = 1; i < options.files.size(); ++i) {
+        const std::string& pair = options.files[i];
+        const std::size_t equals = pair.find('=');
+        OmbAttributeValue value;
+        if (equals == std::string::npos || equals == 0 || !literal(pair.substr(equals + 1), value)) {
+            std::cerr << "omb: '" << pair
+                      << "' is not NAME=VALUE with a literal value (3, 2.5, \"text\", #atom, true)\n";
+            return 2;
+        }
+        attributes->setGeneric(OmbAtoms::atom(OmbString(pair.substr(0, equals))), value);
+    }
+    const std::string& text = options.files[0];
+    OmbRef<OmbExpression> expression;
+    try {
+        expression = OmbExpression::parse(OmbString(text));
+    } catch (const OmbXExpressionParseError& e) {
+        const std::size_t position = std::stoul(std::string(e.argument(2).view()));
+        std::cerr << "omb: " << e.argument(3) << "\n  " << text << "\n  " << std::string(position, ' ') << "^\n";
+        return 1;
+    }
+    OmbAttributeValue result;
+    if (!expression->evaluate(OmbReadOnlyAttributes(attributes), result)) {
+        std::cout << "null\n";
+        return 0;
+    }
+    OmbAttributeValue shown;
+    Omb_toString(result, shown);
+    const bool quoted = result.type() == OmbAttributeString;
+    std::cout << (result.type() == OmbAttributeAtom ? "#" : "") << (quoted ? "\"" : "") << shown.asString()
+              << (quoted ? "\"" : "") << " (" << Omb_attributeTypeName(result.type()) << ")\n";
+    return 0;
+}
+
 int run(const Options& options) {
+    if (options.command == "expr") return evaluateExpression(options);
     if (options.command == "info" && options.files.empty()) {
         std::cout << "OECore " << OmbRuntime::version() << "\n";
         printClasses(std::cout);

@@ -39,22 +39,30 @@ private:
 class OmbReadOnlyAttributes {
 public:
     OmbReadOnlyAttributes() = default;
-    OmbReadOnlyAttributes(const OmbRef<OmbAttributeSet>& set) : set_(set) {}
+    OmbReadOnlyAttributes(const OmbRef<OmbAttributeSet>& set) : set_(set), borrowed_(set.get()) {}
+    // Borrows the set without counting a reference; the set must outlive the
+    // view. For loops that evaluate many features.
+    static OmbReadOnlyAttributes borrow(const OmbAttributeSet& set) {
+        OmbReadOnlyAttributes view;
+        view.borrowed_ = &set;
+        return view;
+    }
     // The list must outlive the view.
     OmbReadOnlyAttributes(const OmbAttributeSetList& list) : list_(&list) {}
 
     bool containsKey(OmbAtom key) const { return findValue(key) != nullptr; }
     const OmbAttributeValue* findValue(OmbAtom key) const {
         if (list_) return list_->findValue(key);
-        return set_ ? set_->findValue(key) : nullptr;
+        return borrowed_ ? borrowed_->findValue(key) : nullptr;
     }
     template <class T>
     bool get(OmbAtom key, T& out) const {
         if (list_) return list_->get(key, out);
-        return set_ && set_->get(key, out);
+        return borrowed_ && borrowed_->get(key, out);
     }
 
 private:
-    OmbRef<OmbAttributeSet> set_;
+    OmbRef<OmbAttributeSet> set_;  // keeps a counted set alive
+    const OmbAttributeSet* borrowed_ = nullptr;
     const OmbAttributeSetList* list_ = nullptr;
 };

@@ -23,7 +23,9 @@ public:
     OmbCondition* clone() const override { return new OmbCondition(*this); }
 
     virtual bool eval(const OmbReadOnlyAttributes& attributes) const;
-    bool eval(const OmbRef<OmbAttributeSet>& attributes) const { return eval(OmbReadOnlyAttributes(attributes)); }
+    bool eval(const OmbRef<OmbAttributeSet>& attributes) const {
+        return attributes && eval(OmbReadOnlyAttributes::borrow(*attributes));
+    }
     void dependents(std::set<OmbAtom>& keys) const;
 
     const OmbString& expression() const noexcept { return text_; }
