@@ -37,6 +37,7 @@
 #include <oecore/attr/atoms.h>
 #include <oecore/attr/attributeset.h>
 #include <oecore/attr/attributesetlist.h>
+#include <oecore/attr/attributeusage.h>
 #include <oecore/attr/attributevalue.h>
 #include <oecore/attr/attributevariable.h>
 #include <oecore/attr/color.h>

@@ -1,3 +1,4 @@
+#include <oecore/attr/attributeusage.h>
 #include <oecore/attr/condition.h>
 #include <oecore/attr/expression.h>
 #include <oecore/config/configuration.h>
@@ -297,4 +298,27 @@ TEST(Condition, ReadsFromConfigurationsAndFailsTheLoadWhenBad) {
                       OmbDataSetInitialization::Delayed, {});
               }),
               "Error parsing expression '1 +', position 3: Unexpected token");
+}
+
+TEST(AttributeUsage, ListsPairsInOrderWithoutMerging) {
+    OmbRef<OmbCondition> deep(new OmbCondition(OmbString("depth > 10")));
+    OmbAttributeUsage usage;
+    const OmbAtom depth = OmbAtoms::atom(OmbString("depth"));
+    usage.addItem(depth, deep);
+    usage.addItem(depth, deep);
+    usage.addItem(OmbAtoms::atom(OmbString("name")));
+    EXPECT_EQ(usage.count(), 3u);
+    OmbAtom key = 0;
+    OmbRef<OmbCondition> condition;
+    usage.getItem(2, key, condition);
+    EXPECT_FALSE(condition);
+    std::vector<OmbAtom> keys;
+    usage.getUsedAttributes(keys);
+    EXPECT_EQ(keys.size(), 3u);
+    OmbAttributeUsage same;
+    same.addItem(depth, deep);
+    EXPECT_FALSE(same == usage);
+    same.addItem(depth, deep);
+    same.addItem(OmbAtoms::atom(OmbString("name")));
+    EXPECT_TRUE(same == usage);
 }
