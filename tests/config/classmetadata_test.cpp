@@ -1,6 +1,7 @@
 #include <oecore/config/boxedvalue.h>
 #include <oecore/config/classmetadata.h>
 #include <oecore/config/valueparsers.h>
+#include <oecore/config/xmlparser.h>
 #include <oecore/core/exception.h>
 
 #include <gtest/gtest.h>
@@ -9,14 +10,10 @@
 #include <clocale>
 #include <string>
 
-// The reader's state arrives with the reader; these conversions need none of it.
-class OmbXmlParserContext {};
-
 namespace {
 
-// Built-in values convert without looking at the reader's state.
 OmbXmlParserContext& noContext() {
-    static OmbXmlParserContext context;
+    static OmbXmlParserContext context({}, OmbDataSetInitialization::Delayed, {});
     return context;
 }
 
