@@ -47,6 +47,9 @@
 #include <oecore/attr/undefinedvalue.h>
 #include <oecore/attr/visenums.h>
 
+#include <oecore/crs/ellipsoid.h>
+#include <oecore/crs/primemeridian.h>
+
 #include <oecore/config/boxedvalue.h>
 #include <oecore/config/classdescription.h>
 #include <oecore/config/classmetadata.h>
