@@ -47,7 +47,11 @@
 #include <oecore/attr/undefinedvalue.h>
 #include <oecore/attr/visenums.h>
 
+#include <oecore/linalg/point.h>
+
+#include <oecore/crs/datumshift.h>
 #include <oecore/crs/ellipsoid.h>
+#include <oecore/crs/geodeticdatum.h>
 #include <oecore/crs/primemeridian.h>
 
 #include <oecore/config/boxedvalue.h>

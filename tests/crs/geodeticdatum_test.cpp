@@ -1,0 +1,186 @@
+#include <oecore/config/configuration.h>
+#include <oecore/core/exception.h>
+#include <oecore/core/runtime.h>
+#include <oecore/crs/geodeticdatum.h>
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <cstdio>
+#include <fstream>
+#include <random>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "../errortext.h"
+
+namespace {
+
+class Datums : public ::testing::Test {
+protected:
+    void SetUp() override { OmbRuntime::init(); }
+    void TearDown() override { OmbRuntime::shutdown(); }
+};
+
+OmbRef<OmbGeodeticDatum> helmertDatum(const OmbRef<OmbEllipsoid>& ellipsoid, const OmbHelmertDatumShift::Parameters& p,
+                                      const char* name = "D") {
+    OmbRef<OmbHelmertDatumShift> shift(new OmbHelmertDatumShift);
+    shift->parameters(p);
+    OmbRef<OmbGeodeticDatum> datum(new OmbGeodeticDatum(ellipsoid, OmbPrimeMeridian::greenwich(), shift));
+    datum->name(OmbString(name));
+    return datum;
+}
+
+// OSGB 36 to WGS 84 (EPSG 1314, position vector).
+OmbHelmertDatumShift::Parameters osgb() {
+    OmbHelmertDatumShift::Parameters p;
+    p.dx = 446.448, p.dy = -125.157, p.dz = 542.06;
+    p.rx = 0.15, p.ry = 0.247, p.rz = 0.842;
+    p.scaleDifference = -20.489;
+    return p;
+}
+
+// PROJ's cs2cs over "lon lat h" lines.
+std::vector<OmbPoint> cs2cs(const std::string& from, const std::string& to, const std::vector<OmbPoint>& points) {
+    const std::string input = ::testing::TempDir() + "/cs2cs-in.txt";
+    const std::string output = ::testing::TempDir() + "/cs2cs-out.txt";
+    std::ofstream in(input);
+    char line[128];
+    for (const OmbPoint& p : points) {
+        std::snprintf(line, sizeof line, "%.12f %.12f %.4f\n", p.x, p.y, p.z);
+        in << line;
+    }
+    in.close();
+    const std::string command = "cs2cs -f %.12f " + from + " +to " + to + " < " + input + " > " + output;
+    std::vector<OmbPoint> out;
+    if (std::system(command.c_str()) != 0) return out;
+    std::ifstream result(output);
+    for (OmbPoint p; result >> p.x >> p.y >> p.z;) out.push_back(p);
+    return out;
+}
+
+std::vector<OmbPoint> britishPoints() {
+    std::mt19937 random(1314);
+    std::uniform_real_distribution<double> lon(-8, 2), lat(49.5, 61), h(0, 1000);
+    std::vector<OmbPoint> points;
+    for (int i = 0; i < 500; ++i) points.emplace_back(lon(random), lat(random), h(random));
+    return points;
+}
+
+}  // namespace
+
+TEST_F(Datums, HelmertAgreesWithProjInBothConventionsAndReturnsExactly) {
+    const auto points = britishPoints();
+    const auto expected = cs2cs("+proj=longlat +ellps=airy +towgs84=446.448,-125.157,542.06,0.15,0.247,0.842,-20.489",
+                                "+proj=longlat +datum=WGS84", points);
+    ASSERT_EQ(expected.size(), points.size()) << "cs2cs (proj-bin) is needed";
+    const auto pv = helmertDatum(OmbEllipsoid::airy1830(), osgb());
+    OmbHelmertDatumShift::Parameters cf = osgb();
+    cf.rx = -cf.rx, cf.ry = -cf.ry, cf.rz = -cf.rz;
+    cf.convention = OmbRotationSignConvention::CoordinateFrameRotation;
+    const auto frame = helmertDatum(OmbEllipsoid::airy1830(), cf);
+    const OmbGeodeticDatum& wgs84 = *OmbGeodeticDatum::wgs84();
+    double worst = 0, roundTrip = 0;
+    for (std::size_t i = 0; i < points.size(); ++i) {
+        OmbPoint p = points[i];
+        OmbPoint q = points[i];
+        pv->changeDatumTo(wgs84, p);
+        frame->changeDatumTo(wgs84, q);
+        worst = std::max({worst, std::fabs(p.x - expected[i].x), std::fabs(p.y - expected[i].y)});
+        ASSERT_TRUE(p.approxEqual(q, 1e-9));
+        wgs84.changeDatumTo(*pv, p);
+        roundTrip = std::max({roundTrip, std::fabs(p.x - points[i].x), std::fabs(p.y - points[i].y)});
+    }
+    EXPECT_LT(worst, 1e-8) << "degrees (about 1 mm)";
+    EXPECT_LT(roundTrip, 1e-9) << "degrees";
+}
+
+TEST_F(Datums, TwoHelmertShiftsToOneDatumComposeIntoOneStep) {
+    OmbHelmertDatumShift::Parameters ed50;
+    ed50.dx = -87, ed50.dy = -98, ed50.dz = -121;
+    const auto a = helmertDatum(OmbEllipsoid::international1924(), ed50, "ED50");
+    const auto b = helmertDatum(OmbEllipsoid::airy1830(), osgb(), "OSGB36");
+    OmbPoint direct(-1.5, 52.5, 10);
+    a->changeDatumTo(*b, direct);
+    OmbPoint viaPivot(-1.5, 52.5, 10);
+    a->changeDatumTo(*OmbGeodeticDatum::wgs84(), viaPivot);
+    OmbGeodeticDatum::wgs84()->changeDatumTo(*b, viaPivot);
+    EXPECT_TRUE(direct.approxEqual(viaPivot, 1e-9)) << direct.x - viaPivot.x << " " << direct.y - viaPivot.y;
+}
+
+TEST_F(Datums, OtherShiftsAndTheWalk) {
+    // Long/lat offsets wrap once.
+    OmbRef<OmbLoLaOffsetsDatumShift> offsets(new OmbLoLaOffsetsDatumShift);
+    offsets->longitudeOffset = 1;
+    offsets->latitudeOffset = -0.5;
+    const OmbRef<OmbGeodeticDatum> shifted(
+        new OmbGeodeticDatum(OmbEllipsoid::wgs84(), OmbPrimeMeridian::greenwich(), offsets));
+    OmbPoint p(179.5, 10);
+    shifted->changeDatumTo(*OmbGeodeticDatum::wgs84(), p);
+    EXPECT_EQ(p, OmbPoint(-179.5, 9.5));
+
+    // Longitudes counted from Paris.
+    const OmbRef<OmbGeodeticDatum> paris(
+        new OmbGeodeticDatum(OmbEllipsoid::clarke1880Ign(), OmbPrimeMeridian::paris(),
+                             OmbRef<OmbDatumShift>(new OmbChangedPrimeMeridianDatumShift)));
+    OmbPoint q(0, 48);
+    paris->changeDatumTo(*OmbGeodeticDatum::wgs84(), q);
+    EXPECT_DOUBLE_EQ(q.x, 2.33722917);
+
+    // A datum with no shift other than WGS 84 is a pivot of its own.
+    const OmbRef<OmbGeodeticDatum> island(
+        new OmbGeodeticDatum(OmbEllipsoid::bessel1841(), OmbPrimeMeridian::greenwich(), OmbRef<OmbDatumShift>()));
+    island->name(OmbString("Island"));
+    EXPECT_EQ(
+        errorOf([&] { island->changeDatumTo(*OmbGeodeticDatum::wgs84(), q); }),
+        "Can't transform coordinates from GeodeticDatum Island to GeodeticDatum Wgs84, since there is no chain of "
+        "DatumShifts connecting them.");
+
+    // One shift, one datum.
+    EXPECT_THROW(OmbGeodeticDatum(OmbEllipsoid::wgs84(), OmbPrimeMeridian::greenwich(), offsets), OmbXSharingViolation);
+
+    // WGS 84 equivalence.
+    EXPECT_TRUE(OmbGeodeticDatum(OmbEllipsoid::grs1980(), OmbPrimeMeridian::greenwich(),
+                                 OmbRef<OmbDatumShift>(new OmbIdentityDatumShift))
+                    .isWgs84Equivalent());
+    EXPECT_FALSE(shifted->isWgs84Equivalent());
+}
+
+TEST_F(Datums, FallbackShiftsCheckTheirAlternatives) {
+    OmbRef<OmbFallbackDatumShift> fallback(new OmbFallbackDatumShift);
+    fallback->name(OmbString("F"));
+    OmbRef<OmbFallbackDatumShift::Alternatives> list(new OmbFallbackDatumShift::Alternatives);
+    EXPECT_EQ(errorOf([&] { fallback->alternatives(list); }),
+              "No alternatives given for FallbackedDatumShift F; needs at least two.");
+    list->add(OmbRef<OmbDatumShift>(new OmbIdentityDatumShift));
+    EXPECT_EQ(errorOf([&] { fallback->alternatives(list); }),
+              "Only one alternative given for FallbackedDatumShift F; needs at least two.");
+    OmbRef<OmbIdentityDatumShift> elsewhere(new OmbIdentityDatumShift);
+    elsewhere->knownDatum(OmbRef<OmbGeodeticDatum>(new OmbGeodeticDatum));
+    list->add(elsewhere);
+    EXPECT_NE(errorOf([&] { fallback->alternatives(list); }).find("do not use the same knownDatum"), std::string::npos);
+}
+
+TEST_F(Datums, DatumsReadFromConfigurations) {
+    const auto c = OmbXmlParser::loadString(
+        OmbString("<Configuration Namespace='D'>"
+                  "<GeodeticDatum Name='OSGB36' Public='true' Authority='epsg' AuthorityCode='6277'"
+                  " Ellipsoid='{ResourceReference Predefined=true, Value=Ellipsoids.Airy1830}'>"
+                  "<GeodeticDatum.DatumShift><HelmertDatumShift DX='446.448' DY='-125.157' DZ='542.06'"
+                  " RotationX='0.15' RotationY='0.247' RotationZ='0.842' ScaleDifference='-20.489'/>"
+                  "</GeodeticDatum.DatumShift></GeodeticDatum></Configuration>"),
+        {}, OmbDataSetInitialization::Delayed, {});
+    const auto read = omb_dynamic_cast<OmbGeodeticDatum>(c->getPublicObject(OmbString("OSGB36")));
+    ASSERT_TRUE(read);
+    const auto made = helmertDatum(OmbEllipsoid::airy1830(), osgb());
+    OmbPoint a(-2, 53, 100), b(-2, 53, 100);
+    read->changeDatumTo(*OmbGeodeticDatum::wgs84(), a);
+    made->changeDatumTo(*OmbGeodeticDatum::wgs84(), b);
+    EXPECT_EQ(a, b);
+    // Saved and read again, the datum refers to the predefined ellipsoid and WGS 84.
+    const OmbString saved = read->save();
+    EXPECT_NE(saved.find(OmbString("Value=\"Ellipsoids.Airy1830\" Predefined=\"true\"")), -1) << saved;
+    const auto again = OmbXmlParser::loadString(saved, {}, OmbDataSetInitialization::Delayed, {});
+    EXPECT_TRUE(again->getPublicObject(OmbString("OSGB36")));
+}
