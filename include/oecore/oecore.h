@@ -51,6 +51,7 @@
 
 #include <oecore/crs/datumshift.h>
 #include <oecore/crs/ellipsoid.h>
+#include <oecore/crs/geodesic.h>
 #include <oecore/crs/geodeticdatum.h>
 #include <oecore/crs/primemeridian.h>
 

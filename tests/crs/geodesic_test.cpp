@@ -1,0 +1,99 @@
+#include <oecore/crs/geodesic.h>
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <cstdio>
+#include <fstream>
+#include <random>
+#include <string>
+#include <vector>
+
+namespace {
+
+// GeographicLib's GeodSolve (exact) over the lines; its output lines.
+std::vector<std::vector<double>> geodSolve(const std::string& options, const std::vector<std::string>& lines) {
+    const std::string input = ::testing::TempDir() + "/geodsolve-in.txt";
+    const std::string output = ::testing::TempDir() + "/geodsolve-out.txt";
+    std::ofstream in(input);
+    for (const std::string& line : lines) in << line << "\n";
+    in.close();
+    std::vector<std::vector<double>> rows;
+    if (std::system(("GeodSolve -p 9 " + options + " < " + input + " > " + output).c_str()) != 0) return rows;
+    std::ifstream out(output);
+    for (double a, b, c; out >> a >> b >> c;) rows.push_back({a, b, c});
+    return rows;
+}
+
+double angleDifference(double a, double b) {
+    const double d = std::fmod(std::fabs(a - b), 360.0);
+    return std::min(d, 360 - d);
+}
+
+}  // namespace
+
+TEST(Geodesic, InverseAndDirectAgreeWithGeographicLib) {
+    const OmbEllipsoid wgs84;
+    std::mt19937 random(1975);
+    std::uniform_real_distribution<double> lon(-180, 180), lat(-89, 89);
+    std::vector<std::pair<OmbPoint, OmbPoint>> pairs;
+    std::vector<std::string> lines;
+    char line[160];
+    for (int i = 0; i < 1000; ++i) {
+        const OmbPoint a(lon(random), lat(random)), b(lon(random), lat(random) * 0.5);
+        pairs.emplace_back(a, b);
+        std::snprintf(line, sizeof line, "%.12f %.12f %.12f %.12f", a.y, a.x, b.y, b.x);
+        lines.push_back(line);
+    }
+    const auto exact = geodSolve("-i", lines);
+    ASSERT_EQ(exact.size(), pairs.size()) << "GeodSolve (geographiclib-tools) is needed";
+    double distance = 0, azimuth = 0;
+    int unsettled = 0;
+    std::vector<std::string> directLines;
+    for (std::size_t i = 0; i < pairs.size(); ++i) {
+        const OmbGeodesicInverse g = Omb_distanceAndAzimuthsVincenty(wgs84, pairs[i].first, pairs[i].second);
+        if (!g.converged) {
+            ++unsettled;
+            continue;
+        }
+        distance = std::max(distance, std::fabs(g.distance - exact[i][2]));
+        azimuth = std::max(
+            {azimuth, angleDifference(g.azimuth, exact[i][0]), angleDifference(g.backAzimuth, exact[i][1] + 180)});
+        std::snprintf(line, sizeof line, "%.12f %.12f %.12f %.6f", pairs[i].first.y, pairs[i].first.x, g.azimuth,
+                      g.distance);
+        directLines.push_back(line);
+    }
+    EXPECT_LT(distance, 1e-3) << "metres";
+    EXPECT_LT(azimuth, 1e-7) << "degrees";
+    EXPECT_LT(unsettled, 10) << "nearly antipodal pairs";
+
+    // The direct problem from the same starts, azimuths and distances.
+    const auto ends = geodSolve("", directLines);
+    ASSERT_EQ(ends.size(), directLines.size());
+    double position = 0;
+    std::size_t row = 0;
+    for (std::size_t i = 0; i < pairs.size(); ++i) {
+        const OmbGeodesicInverse g = Omb_distanceAndAzimuthsVincenty(wgs84, pairs[i].first, pairs[i].second);
+        if (!g.converged) continue;
+        const OmbPoint end = Omb_pointPlusDirectedDistance(wgs84, pairs[i].first, g.azimuth, g.distance);
+        position = std::max({position, std::fabs(end.y - ends[row][0]), angleDifference(end.x, ends[row][1])});
+        ++row;
+    }
+    EXPECT_LT(position, 1e-8) << "degrees";
+}
+
+TEST(Geodesic, EdgeCases) {
+    const OmbEllipsoid wgs84;
+    const OmbGeodesicInverse same = Omb_distanceAndAzimuthsVincenty(wgs84, OmbPoint(10, 20), OmbPoint(10, 20));
+    EXPECT_EQ(same.distance, 0);
+    EXPECT_EQ(same.azimuth, 0);
+    EXPECT_EQ(same.backAzimuth, 180);
+    // Along the equator the formulas divide by nothing.
+    const OmbGeodesicInverse equator = Omb_distanceAndAzimuthsVincenty(wgs84, OmbPoint(0, 0), OmbPoint(1, 0));
+    EXPECT_TRUE(equator.converged);
+    EXPECT_NEAR(equator.distance, 111319.49079327357, 1e-6);
+    EXPECT_NEAR(equator.azimuth, 90, 1e-12);
+    EXPECT_NEAR(equator.backAzimuth, 270, 1e-12);
+    // A pole is approached, not reached: latitudes are clamped.
+    EXPECT_TRUE(std::isfinite(Omb_distanceAndAzimuthsVincenty(wgs84, OmbPoint(0, 90), OmbPoint(0, -90)).distance));
+}
