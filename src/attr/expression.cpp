@@ -270,34 +270,34 @@ bool OmbExpression::evaluate(const OmbReadOnlyAttributes& attributes, OmbAttribu
     return !out.is_singular();
 }
 
-bool OmbExpression::evaluate(const OmbReadOnlyAttributes& attributes, std::int64_t& out, unsigned int* seed) const {
+namespace {
+
+// Evaluates, converts the result as int(), double() or string() would and
+// reads it out; false for null.
+template <class T, class Convert, class Read>
+bool evaluateAs(const OmbExpression& e, const OmbReadOnlyAttributes& attributes, T& out, unsigned int* seed,
+                Convert convert, Read read) {
     OmbAttributeValue v;
     OmbAttributeValue converted;
-    eval(attributes, v, seed);
-    Omb_toInt(v, converted);
+    e.evaluate(attributes, v, seed);
+    convert(v, converted);
     if (converted.is_singular()) return false;
-    out = converted.asInt64();
+    out = read(converted);
     return true;
+}
+
+}  // namespace
+
+bool OmbExpression::evaluate(const OmbReadOnlyAttributes& attributes, std::int64_t& out, unsigned int* seed) const {
+    return evaluateAs(*this, attributes, out, seed, Omb_toInt, [](const Value& v) { return v.asInt64(); });
 }
 
 bool OmbExpression::evaluate(const OmbReadOnlyAttributes& attributes, double& out, unsigned int* seed) const {
-    OmbAttributeValue v;
-    OmbAttributeValue converted;
-    eval(attributes, v, seed);
-    Omb_toDouble(v, converted);
-    if (converted.is_singular()) return false;
-    out = converted.asDouble();
-    return true;
+    return evaluateAs(*this, attributes, out, seed, Omb_toDouble, [](const Value& v) { return v.asDouble(); });
 }
 
 bool OmbExpression::evaluate(const OmbReadOnlyAttributes& attributes, OmbString& out, unsigned int* seed) const {
-    OmbAttributeValue v;
-    OmbAttributeValue converted;
-    eval(attributes, v, seed);
-    Omb_toString(v, converted);
-    if (converted.is_singular()) return false;
-    out = converted.asString();
-    return true;
+    return evaluateAs(*this, attributes, out, seed, Omb_toString, [](const Value& v) { return v.asString(); });
 }
 
 void OmbExpression::eval(const OmbReadOnlyAttributes& attributes, OmbAttributeValue& out, unsigned int* seed) const {

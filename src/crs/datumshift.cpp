@@ -19,12 +19,7 @@ OMB_DEFINE_DESCRIBED_MEMBERS(OmbFallbackDatumShift)
 // --- configuration ---------------------------------------------------------------
 
 OMB_DESCRIBE_CLASS(OmbDatumShift) {
-    d.property<OmbString>(
-        "Authority", [](const OmbDatumShift& s) { return s.authority(); },
-        [](OmbDatumShift& s, const OmbString& v) { s.authority(v); });
-    d.property<OmbString>(
-        "AuthorityCode", [](const OmbDatumShift& s) { return s.authorityCode(); },
-        [](OmbDatumShift& s, const OmbString& v) { s.authorityCode(v); });
+    Omb_describeAuthority(d);
     d.object<OmbGeodeticDatum>(
         "KnownDatum", [](const OmbDatumShift& s) { return s.knownDatum(); },
         [](OmbDatumShift& s, const OmbRef<OmbGeodeticDatum>& v) { s.knownDatum(v); });

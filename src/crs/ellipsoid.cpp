@@ -7,12 +7,7 @@ OMB_DEFINE_ENGINE_CLASS(OmbEllipsoid, OmbResourceObject, "Ellipsoid", 0)
 OMB_DEFINE_DESCRIBED_MEMBERS(OmbEllipsoid)
 
 OMB_DESCRIBE_CLASS(OmbEllipsoid) {
-    d.property<OmbString>(
-        "Authority", [](const OmbEllipsoid& e) { return e.authority(); },
-        [](OmbEllipsoid& e, const OmbString& v) { e.authority(v); });
-    d.property<OmbString>(
-        "AuthorityCode", [](const OmbEllipsoid& e) { return e.authorityCode(); },
-        [](OmbEllipsoid& e, const OmbString& v) { e.authorityCode(v); });
+    Omb_describeAuthority(d);
     d.property<double>(
          "EquatorialRadius", [](const OmbEllipsoid& e) { return e.equatorialRadius(); },
          [](OmbEllipsoid& e, double v) { e.equatorialRadius(v); })

@@ -9,11 +9,7 @@ OMB_DEFINE_DESCRIBED_MEMBERS(OmbGeodeticDatum)
 
 OMB_DESCRIBE_CLASS(OmbGeodeticDatum) {
     using D = OmbGeodeticDatum;
-    d.property<OmbString>(
-        "Authority", [](const D& x) { return x.authority(); }, [](D& x, const OmbString& v) { x.authority(v); });
-    d.property<OmbString>(
-        "AuthorityCode", [](const D& x) { return x.authorityCode(); },
-        [](D& x, const OmbString& v) { x.authorityCode(v); });
+    Omb_describeAuthority(d);
     d.object<OmbEllipsoid>(
          "Ellipsoid", [](const D& x) { return x.ellipsoid(); },
          [](D& x, const OmbRef<OmbEllipsoid>& v) { x.ellipsoid(v); })

@@ -372,6 +372,17 @@ private:
     OmbClassDescription& description_;
 };
 
+// The "Authority" and "AuthorityCode" properties of a class with
+// authority()/authorityCode() accessors.
+template <class T>
+void Omb_describeAuthority(OmbDescriptionBuilder<T>& d) {
+    d.template property<OmbString>(
+        "Authority", [](const T& o) { return o.authority(); }, [](T& o, const OmbString& v) { o.authority(v); });
+    d.template property<OmbString>(
+        "AuthorityCode", [](const T& o) { return o.authorityCode(); },
+        [](T& o, const OmbString& v) { o.authorityCode(v); });
+}
+
 template <class T>
 bool Omb_describeClass(void (*describe)(OmbDescriptionBuilder<T>&)) {
     OmbClassDescription::Factory factory = nullptr;
