@@ -5,4 +5,9 @@ root=$(cd "$(dirname "$0")/.." && pwd)
 bash "$root/scripts/setup.sh"
 bash "$root/scripts/build.sh" release -DCMAKE_BUILD_TYPE=Release -DOECORE_BUILD_TESTS=OFF \
   -DOECORE_BUILD_BENCHMARKS=OFF
-"$root/build/release/tools/omb/omb" info
+omb="$root/build/release/tools/omb/omb"
+"$omb" info
+echo
+"$omb" info "$root/data/demo/harbour.px" --param 'berths=depth >= 12'
+echo
+"$omb" expr 'kind = #berth and depth >= 9.5' kind=#berth depth=11.2

@@ -57,3 +57,6 @@ expect("expr;depth * 2;depth=-1.5" 0 "-3 \\(double\\)")
 expect("expr;missing + 1" 0 "null")
 expect("expr;class = = 2" 1 "Unexpected token\n  class = = 2\n          \\^")
 expect("expr;a;a=harbour" 2 "'a=harbour' is not NAME=VALUE with a literal value")
+
+# The bundled demo loads.
+expect("info;${DEMO}" 0 "Harbour.OSGB36  GeodeticDatum\n3 public objects")
