@@ -10,7 +10,7 @@ packages=(
   libtbb-dev
   googletest libgtest-dev libbenchmark-dev
   clang libfuzzer-14-dev libclang-rt-14-dev
-  geographiclib-tools proj-bin
+  geographiclib-tools proj-bin libproj-dev
 )
 
 missing=()

@@ -1,12 +1,20 @@
 #include <oecore/core/exception.h>
 #include <oecore/core/stringbuilder.h>
+#include <oecore/core/stringutils.h>
 #include <oecore/crs/geodeticdatum.h>
 
+#include <proj.h>
+
+#include <algorithm>
 #include <cmath>
+#include <filesystem>
+#include <vector>
 
 OMB_DEFINE_ENGINE_CLASS(OmbDatumShift, OmbResourceObject, "DatumShift", 0)
 OMB_DEFINE_ENGINE_CLASS(OmbHelmertDatumShift, OmbDatumShift, "HelmertDatumShift", 0)
 OMB_DEFINE_DESCRIBED_MEMBERS(OmbHelmertDatumShift)
+OMB_DEFINE_ENGINE_CLASS(OmbGridFileDatumShift, OmbDatumShift, "GridFileDatumShift", 0)
+OMB_DEFINE_DESCRIBED_MEMBERS(OmbGridFileDatumShift)
 OMB_DEFINE_ENGINE_CLASS(OmbLoLaOffsetsDatumShift, OmbDatumShift, "LongLatOffsetDatumShift", 0)
 OMB_DEFINE_DESCRIBED_MEMBERS(OmbLoLaOffsetsDatumShift)
 OMB_DEFINE_ENGINE_CLASS(OmbChangedPrimeMeridianDatumShift, OmbDatumShift, "ChangedPrimeMeridianDatumShift", 0)
@@ -54,6 +62,17 @@ OMB_DESCRIBE_CLASS(OmbHelmertDatumShift) {
     helmert(d, "ScaleDifference", &P::scaleDifference, 0.0);
     helmert(d, "RotationSignConvention", &P::convention, OmbRotationSignConvention::PositionVectorTransform);
     helmert(d, "Direction", &P::direction, OmbDatumShiftDirection::ToKnownDatum);
+}
+
+OMB_DESCRIBE_CLASS(OmbGridFileDatumShift) {
+    using S = OmbGridFileDatumShift;
+    d.property<OmbString>("Path", &S::path, [](S& s, const OmbString& v) { s.path = v; }).required();
+    d.property<OmbString>("FileName", &S::fileName, [](S& s, const OmbString& v) { s.fileName = v; }).required();
+    d.property<bool>(
+        "SearchSubdirectories", &S::searchSubdirectories, [](S& s, bool v) { s.searchSubdirectories = v; }, false);
+    d.property<OmbDatumShiftDirection>(
+        "Direction", &S::direction, [](S& s, OmbDatumShiftDirection v) { s.direction = v; },
+        OmbDatumShiftDirection::ToKnownDatum);
 }
 
 OMB_DESCRIBE_CLASS(OmbLoLaOffsetsDatumShift) {
@@ -261,6 +280,153 @@ bool OmbChangedPrimeMeridianDatumShift::equivalent(const OmbDatumShift& other) c
 
 bool OmbIdentityDatumShift::equivalent(const OmbDatumShift& other) const {
     return dynamic_cast<const OmbIdentityDatumShift*>(&other) && sameKnownDatum(*this, other);
+}
+
+// --- grid files ----------------------------------------------------------------------
+
+namespace {
+
+constexpr std::size_t maxGridFileNameLength = 126;
+
+std::vector<OmbString> findGridFiles(const OmbString& folder, const OmbString& pattern, bool recursive) {
+    namespace fs = std::filesystem;
+    std::vector<OmbString> found;
+    const auto consider = [&](const fs::directory_entry& entry) {
+        if (entry.is_regular_file() &&
+            OmbStringUtils::wildcardMatch(pattern, OmbString(entry.path().filename().native())))
+            found.emplace_back(std::string_view(entry.path().native()));
+    };
+    const fs::path root{std::string(folder)};
+    std::error_code error;
+    if (recursive) {
+        for (fs::recursive_directory_iterator it(root, error), end; !error && it != end; it.increment(error))
+            consider(*it);
+    } else {
+        for (fs::directory_iterator it(root, error), end; !error && it != end; it.increment(error)) consider(*it);
+    }
+    std::sort(found.begin(), found.end());
+    return found;
+}
+
+// The Spanish peninsular grids overlap the Balearic one, whose finer
+// values must win on the islands.
+void putBalearicGridFirst(std::vector<OmbString>& files) {
+    if (files.size() != 2) return;
+    const auto leaf = [](const OmbString& f) { return std::filesystem::path(std::string(f)).filename().string(); };
+    if (leaf(files[1]) == "BALR2009.gsb" && (leaf(files[0]) == "PENR2009.gsb" || leaf(files[0]) == "R2009V9.gsb"))
+        std::swap(files[0], files[1]);
+}
+
+OmbString joined(const std::vector<OmbString>& files) {
+    OmbString list;
+    for (const OmbString& f : files) list += (list.empty() ? "" : ",") + f;
+    return list;
+}
+
+}  // namespace
+
+// The opened grids. PROJ objects are not thread-safe, so every use holds
+// the shift's mutex.
+struct OmbGridFileDatumShift::Grids {
+    OmbString list;
+    bool alaska = false;
+    PJ_CONTEXT* context = nullptr;
+    PJ* transform = nullptr;
+
+    ~Grids() {
+        proj_destroy(transform);
+        proj_context_destroy(context);
+    }
+};
+
+OmbGridFileDatumShift::OmbGridFileDatumShift() = default;
+
+OmbGridFileDatumShift::OmbGridFileDatumShift(const OmbGridFileDatumShift& other)
+    : OmbDatumShift(other),
+      path(other.path),
+      fileName(other.fileName),
+      searchSubdirectories(other.searchSubdirectories),
+      direction(other.direction) {}
+
+OmbGridFileDatumShift::~OmbGridFileDatumShift() = default;
+
+void OmbGridFileDatumShift::construct() const {
+    std::lock_guard lock(mutex_);
+    grids();
+}
+
+OmbString OmbGridFileDatumShift::gridList() const {
+    std::lock_guard lock(mutex_);
+    return grids().list;
+}
+
+OmbGridFileDatumShift::Grids& OmbGridFileDatumShift::grids() const {
+    if (grids_) return *grids_;
+    std::vector<OmbString> files = findGridFiles(path, fileName, searchSubdirectories);
+    if (files.empty()) OMB_THROW(NoFilesFoundByGridFileDatumShift, name(), path, fileName);
+    for (const OmbString& f : files)
+        if (f.size() > maxGridFileNameLength) OMB_THROW(TooLongFileNameInGridFileDatumShift, name(), f);
+    putBalearicGridFirst(files);
+
+    auto grids = std::make_unique<Grids>();
+    grids->list = joined(files);
+    grids->alaska = grids->list.contains("alaska") || grids->list.contains("Alaska") || grids->list.contains("ALASKA");
+    grids->context = proj_context_create();
+    proj_log_level(grids->context, PJ_LOG_NONE);
+    const std::string definition = "+proj=hgridshift +grids=\"" + std::string(grids->list) + "\"";
+    grids->transform = proj_create(grids->context, definition.c_str());
+    if (!grids->transform)
+        OMB_THROW(IOException, "GridFileDatumShift " + name() + " cannot read the grid files " + grids->list + ": " +
+                                   proj_context_errno_string(grids->context, proj_context_errno(grids->context)));
+    grids_ = std::move(grids);
+    return *grids_;
+}
+
+OmbDatumShiftStatus OmbGridFileDatumShift::convert(OmbPoint& p, bool forward) const {
+    std::lock_guard lock(mutex_);
+    const Grids& g = grids();
+    double lon = p.x;
+    if (g.alaska && lon > 160 && p.y > 40) lon -= 360;  // the Alaskan grid lies west of -180
+    constexpr double toRadians = M_PI / 180;
+    const PJ_COORD in = proj_coord(lon * toRadians, p.y * toRadians, 0, 0);
+    const PJ_COORD out = proj_trans(g.transform, forward ? PJ_FWD : PJ_INV, in);
+    const bool failed = proj_errno(g.transform) != 0 || out.lp.lam == HUGE_VAL;
+    proj_errno_reset(g.transform);
+    if (failed || (out.lp.lam == in.lp.lam && out.lp.phi == in.lp.phi)) return 1;
+    p.x = out.lp.lam / toRadians;
+    if (p.x < -180) p.x += 360;
+    p.y = out.lp.phi / toRadians;
+    return 0;
+}
+
+void OmbGridFileDatumShift::throwOutside(const OmbPoint& p) const {
+    OMB_THROW(PointOutsideGridFileDatumShift, number(p.x), number(p.y), name());
+}
+
+OmbDatumShiftStatus OmbGridFileDatumShift::changeDatumToKnownDatumNoExceptions(const OmbGeodeticDatum&,
+                                                                               OmbPoint& p) const {
+    return convert(p, direction == OmbDatumShiftDirection::ToKnownDatum);
+}
+
+OmbDatumShiftStatus OmbGridFileDatumShift::changeDatumFromKnownDatumNoExceptions(const OmbGeodeticDatum&,
+                                                                                 OmbPoint& p) const {
+    return convert(p, direction != OmbDatumShiftDirection::ToKnownDatum);
+}
+
+OmbDatumShiftStatus OmbGridFileDatumShift::changeDatumToKnownDatum(const OmbGeodeticDatum& datum, OmbPoint& p) const {
+    if (changeDatumToKnownDatumNoExceptions(datum, p) != 0) throwOutside(p);
+    return 0;
+}
+
+OmbDatumShiftStatus OmbGridFileDatumShift::changeDatumFromKnownDatum(const OmbGeodeticDatum& datum, OmbPoint& p) const {
+    if (changeDatumFromKnownDatumNoExceptions(datum, p) != 0) throwOutside(p);
+    return 0;
+}
+
+bool OmbGridFileDatumShift::equivalent(const OmbDatumShift& other) const {
+    const auto* o = dynamic_cast<const OmbGridFileDatumShift*>(&other);
+    return o && path == o->path && fileName == o->fileName && searchSubdirectories == o->searchSubdirectories &&
+           direction == o->direction && sameKnownDatum(*this, other);
 }
 
 // --- fallback ------------------------------------------------------------------------

@@ -13,6 +13,7 @@
 
 #include <array>
 #include <atomic>
+#include <memory>
 #include <mutex>
 #include <optional>
 
@@ -149,6 +150,51 @@ public:
     OmbDatumShiftStatus changeDatumFromKnownDatum(const OmbGeodeticDatum& datum, OmbPoint& p) const override;
     bool equivalent(const OmbDatumShift& other) const override;
     bool zeroShifts() const override { return false; }
+};
+
+// Horizontal shifts interpolated in grid files (NTv2, NTv1, CTABLE, CTABLE
+// V2); the height is left as it is. The files are the ones in path whose
+// names match fileName ("*" and "?" wildcards); where grids overlap, the
+// first in the list wins.
+class OmbGridFileDatumShift : public OmbDatumShift {
+    OMB_DECLARE_ENGINE_CLASS()
+    OMB_DESCRIBED_MEMBERS()
+
+public:
+    OmbGridFileDatumShift();
+    OmbGridFileDatumShift(const OmbGridFileDatumShift& other);
+    ~OmbGridFileDatumShift() override;
+    OmbGridFileDatumShift* clone() const override { return new OmbGridFileDatumShift(*this); }
+
+    OmbDatumShiftStatus changeDatumToKnownDatum(const OmbGeodeticDatum& datum, OmbPoint& p) const override;
+    OmbDatumShiftStatus changeDatumFromKnownDatum(const OmbGeodeticDatum& datum, OmbPoint& p) const override;
+    // These still throw when the grid files cannot be found or opened.
+    OmbDatumShiftStatus changeDatumToKnownDatumNoExceptions(const OmbGeodeticDatum& datum, OmbPoint& p) const override;
+    OmbDatumShiftStatus changeDatumFromKnownDatumNoExceptions(const OmbGeodeticDatum& datum,
+                                                              OmbPoint& p) const override;
+    bool equivalent(const OmbDatumShift& other) const override;
+    bool zeroShifts() const override { return false; }
+
+    // Finds the grid files and opens them; the first conversion does this
+    // when nobody did before. Throws when no file matches.
+    void construct() const;
+    // The full names of the grid files in the order they are tried, joined
+    // with ",".
+    OmbString gridList() const;
+
+    OmbString path;
+    OmbString fileName;
+    bool searchSubdirectories = false;
+    OmbDatumShiftDirection direction = OmbDatumShiftDirection::ToKnownDatum;
+
+private:
+    struct Grids;
+    OmbDatumShiftStatus convert(OmbPoint& p, bool forward) const;
+    void throwOutside(const OmbPoint& p) const;
+    Grids& grids() const;
+
+    mutable std::mutex mutex_;
+    mutable std::unique_ptr<Grids> grids_;
 };
 
 // Declares two datums the same.

@@ -1,0 +1,175 @@
+#include <oecore/config/configuration.h>
+#include <oecore/core/runtime.h>
+#include <oecore/crs/geodeticdatum.h>
+
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <cmath>
+#include <cstring>
+#include <functional>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "../core/tempdir.h"
+#include "../errortext.h"
+
+namespace {
+
+constexpr double arcSecond = 1.0 / 3600;
+constexpr double radiansPerDegree = M_PI / 180;
+
+// A CTABLE V2 grid over [10, 12] x [50, 52] in 1 degree steps. shift(lon,
+// lat) gives the longitude shift (positive west) and the latitude shift in
+// arc-seconds at each node.
+std::string ctable2(const std::function<std::pair<double, double>(int, int)>& shift) {
+    std::string file(160, '\0');
+    std::memcpy(file.data(), "CTABLE V2.0", 11);
+    const double corner[4] = {10 * radiansPerDegree, 50 * radiansPerDegree, radiansPerDegree, radiansPerDegree};
+    const int size[2] = {3, 3};
+    std::memcpy(file.data() + 96, corner, sizeof corner);
+    std::memcpy(file.data() + 128, size, sizeof size);
+    for (int row = 0; row < 3; ++row)
+        for (int column = 0; column < 3; ++column) {
+            const auto [lon, lat] = shift(10 + column, 50 + row);
+            const float node[2] = {float(lon * arcSecond * radiansPerDegree),
+                                   float(lat * arcSecond * radiansPerDegree)};
+            file.append(reinterpret_cast<const char*>(node), sizeof node);
+        }
+    return file;
+}
+
+class GridShifts : public ::testing::Test {
+protected:
+    void SetUp() override { OmbRuntime::init(); }
+    void TearDown() override { OmbRuntime::shutdown(); }
+
+    OmbRef<OmbGridFileDatumShift> shift(const std::string& pattern = "*.ct2") const {
+        OmbRef<OmbGridFileDatumShift> s(new OmbGridFileDatumShift);
+        s->name(OmbString("G"));
+        s->path = OmbString(dir.path().string());
+        s->fileName = OmbString(pattern);
+        return s;
+    }
+
+    TempDir dir;
+    // The shifts here do not look at the datum that owns them.
+    const OmbGeodeticDatum& datum() const { return *OmbGeodeticDatum::wgs84(); }
+};
+
+TEST_F(GridShifts, ShiftsInterpolateAndInvert) {
+    // A constant latitude shift and a longitude shift growing linearly to
+    // the east, which bilinear interpolation reproduces exactly.
+    dir.write("a.ct2", ctable2([](int lon, int) { return std::pair(1.0 * (lon - 10), 2.0); }));
+    const auto s = shift();
+    OmbPoint p(10.5, 51.25, 7);
+    ASSERT_EQ(s->changeDatumToKnownDatum(datum(), p), 0);
+    EXPECT_NEAR(p.x, 10.5 - 0.5 * arcSecond, 1e-9);
+    EXPECT_NEAR(p.y, 51.25 + 2 * arcSecond, 1e-9);
+    EXPECT_EQ(p.z, 7);
+    ASSERT_EQ(s->changeDatumFromKnownDatum(datum(), p), 0);
+    EXPECT_NEAR(p.x, 10.5, 1e-9);
+    EXPECT_NEAR(p.y, 51.25, 1e-9);
+
+    // Stored the other way round, the same grid applies inversely.
+    s->direction = OmbDatumShiftDirection::FromKnownDatum;
+    ASSERT_EQ(s->changeDatumFromKnownDatum(datum(), p), 0);
+    EXPECT_NEAR(p.x, 10.5 - 0.5 * arcSecond, 1e-9);
+    EXPECT_NEAR(p.y, 51.25 + 2 * arcSecond, 1e-9);
+}
+
+TEST_F(GridShifts, PointsOutsideTheGridsAreReportedAndKept) {
+    dir.write("a.ct2", ctable2([](int, int) { return std::pair(1.0, 2.0); }));
+    const auto s = shift();
+    OmbPoint p(20, 51, 0);
+    EXPECT_EQ(s->changeDatumToKnownDatumNoExceptions(datum(), p), 1);
+    EXPECT_EQ(p, OmbPoint(20, 51, 0));
+    EXPECT_EQ(errorOf([&] { s->changeDatumFromKnownDatum(datum(), p); }),
+              "Can't transform Lon = 20, Lat = 51 using GridFileDatumShift G, because the point is not covered by "
+              "the grid files.");
+}
+
+TEST_F(GridShifts, AFallbackUsesTheNextAlternativeOutsideTheGrid) {
+    dir.write("a.ct2", ctable2([](int, int) { return std::pair(1.0, 2.0); }));
+    OmbRef<OmbLoLaOffsetsDatumShift> offsets(new OmbLoLaOffsetsDatumShift);
+    offsets->latitudeOffset = 1;
+    OmbRef<OmbFallbackDatumShift::Alternatives> list(new OmbFallbackDatumShift::Alternatives);
+    list->add(shift());
+    list->add(offsets);
+    OmbRef<OmbFallbackDatumShift> fallback(new OmbFallbackDatumShift);
+    fallback->alternatives(list);
+
+    OmbPoint inside(11, 51), outside(30, 51);
+    fallback->changeDatumToKnownDatum(datum(), inside);
+    fallback->changeDatumToKnownDatum(datum(), outside);
+    EXPECT_NEAR(inside.y, 51 + 2 * arcSecond, 1e-9);
+    EXPECT_EQ(outside, OmbPoint(30, 52));
+}
+
+TEST_F(GridShifts, OneShiftServesManyThreads) {
+    dir.write("a.ct2", ctable2([](int lon, int lat) { return std::pair(0.5 * lon, 0.25 * lat); }));
+    const auto s = shift();
+    OmbPoint expected(11.3, 50.7);
+    s->changeDatumToKnownDatum(datum(), expected);
+    std::vector<std::thread> threads;
+    std::atomic<int> wrong{0};
+    for (int t = 0; t < 4; ++t)
+        threads.emplace_back([&] {
+            for (int i = 0; i < 500; ++i) {
+                OmbPoint p(11.3, 50.7);
+                s->changeDatumToKnownDatum(datum(), p);
+                if (!(p == expected)) ++wrong;
+            }
+        });
+    for (std::thread& t : threads) t.join();
+    EXPECT_EQ(wrong, 0);
+}
+
+TEST_F(GridShifts, GridFilesAreFoundByPattern) {
+    const auto grid = ctable2([](int, int) { return std::pair(1.0, 2.0); });
+    std::filesystem::create_directories(dir / "a");
+    std::filesystem::create_directories(dir / "b");
+    dir.write("a/PENR2009.gsb", grid);
+    dir.write("b/BALR2009.gsb", grid);
+    dir.write("notes.txt", "not a grid");
+
+    EXPECT_EQ(
+        errorOf([&] { shift("*.gsb")->construct(); }),
+        "In GridFileDatumShift G, no files in the folder " + dir.path().string() + " matched the given fileName *.gsb");
+    const auto s = shift("*.gsb");
+    s->searchSubdirectories = true;
+    // The Balearic grid goes before the peninsular one that overlaps it.
+    EXPECT_EQ(std::string(s->gridList()), (dir / "b/BALR2009.gsb").string() + "," + (dir / "a/PENR2009.gsb").string());
+
+    const auto broken = shift("notes.txt");
+    EXPECT_NE(errorOf([&] { broken->construct(); }).find("cannot read the grid files"), std::string::npos);
+
+    const std::string deep = std::string(130, 'd');
+    std::filesystem::create_directories(dir / deep);
+    dir.write(deep + "/x.ct2", grid);
+    const auto far = shift();
+    far->searchSubdirectories = true;
+    EXPECT_NE(errorOf([&] { far->construct(); }).find("was longer than 126 characters, namely "), std::string::npos);
+}
+
+TEST_F(GridShifts, GridShiftsAreReadFromConfigurations) {
+    dir.write("with space.ct2", ctable2([](int, int) { return std::pair(1.0, 2.0); }));
+    const auto c =
+        OmbXmlParser::loadString(OmbString("<Configuration Namespace='D'>"
+                                           "<GeodeticDatum Name='Local' Public='true'"
+                                           " Ellipsoid='{ResourceReference Predefined=true, Value=Ellipsoids.Wgs84}'>"
+                                           "<GeodeticDatum.DatumShift><GridFileDatumShift Path='" +
+                                           dir.path().string() +
+                                           "' FileName='*.ct2' Direction='FromKnownDatum'/>"
+                                           "</GeodeticDatum.DatumShift></GeodeticDatum></Configuration>"),
+                                 {}, OmbDataSetInitialization::Delayed, {});
+    const auto local = omb_dynamic_cast<OmbGeodeticDatum>(c->getPublicObject(OmbString("Local")));
+    ASSERT_TRUE(local);
+    OmbPoint p(11, 51);
+    local->changeDatumTo(datum(), p);
+    EXPECT_NEAR(p.x, 11 + arcSecond, 1e-9);
+    EXPECT_NEAR(p.y, 51 - 2 * arcSecond, 1e-9);
+}
+
+}  // namespace
