@@ -20,23 +20,84 @@ namespace {
 constexpr double arcSecond = 1.0 / 3600;
 constexpr double radiansPerDegree = M_PI / 180;
 
-// A CTABLE V2 grid over [10, 12] x [50, 52] in 1 degree steps. shift(lon,
-// lat) gives the longitude shift (positive west) and the latitude shift in
-// arc-seconds at each node.
-std::string ctable2(const std::function<std::pair<double, double>(int, int)>& shift) {
+// Arc-second shifts at a grid node: longitude (positive west) and latitude.
+using NodeShift = std::function<std::pair<double, double>(int lon, int lat)>;
+
+template <class T>
+void append(std::string& file, const T& value) {
+    file.append(reinterpret_cast<const char*>(&value), sizeof value);
+}
+
+// Grids over [west, west + 2] x [50, 52] degrees in 1 degree steps, written
+// the way the two formats store them.
+
+// CTABLE V2: radians, rows from the south, columns from the west.
+std::string ctable2(const NodeShift& shift, int west = 10) {
     std::string file(160, '\0');
     std::memcpy(file.data(), "CTABLE V2.0", 11);
-    const double corner[4] = {10 * radiansPerDegree, 50 * radiansPerDegree, radiansPerDegree, radiansPerDegree};
+    const double corner[4] = {west * radiansPerDegree, 50 * radiansPerDegree, radiansPerDegree, radiansPerDegree};
     const int size[2] = {3, 3};
     std::memcpy(file.data() + 96, corner, sizeof corner);
     std::memcpy(file.data() + 128, size, sizeof size);
-    for (int row = 0; row < 3; ++row)
-        for (int column = 0; column < 3; ++column) {
-            const auto [lon, lat] = shift(10 + column, 50 + row);
-            const float node[2] = {float(lon * arcSecond * radiansPerDegree),
-                                   float(lat * arcSecond * radiansPerDegree)};
-            file.append(reinterpret_cast<const char*>(node), sizeof node);
+    for (int lat = 50; lat <= 52; ++lat)
+        for (int lon = west; lon <= west + 2; ++lon) {
+            const auto [dLon, dLat] = shift(lon, lat);
+            append(file, float(dLon * arcSecond * radiansPerDegree));
+            append(file, float(dLat * arcSecond * radiansPerDegree));
         }
+    return file;
+}
+
+// NTv2: 16-byte records of an 8-byte key and a value, arc-seconds with
+// longitudes positive west, rows from the south, columns from the east.
+std::string ntv2(const NodeShift& shift) {
+    std::string file;
+    const auto key = [&](const char* name) {
+        std::string k(name);
+        k.resize(8, ' ');
+        file += k;
+    };
+    const auto integer = [&](const char* name, int v) {
+        key(name);
+        append(file, v);
+        append(file, 0);
+    };
+    const auto real = [&](const char* name, double v) {
+        key(name);
+        append(file, v);
+    };
+    const auto text = [&](const char* name, const char* v) {
+        key(name);
+        std::string t(v);
+        t.resize(8, ' ');
+        file += t;
+    };
+    integer("NUM_OREC", 11);
+    integer("NUM_SREC", 11);
+    integer("NUM_FILE", 1);
+    text("GS_TYPE", "SECONDS");
+    text("VERSION", "NTv2.0");
+    text("SYSTEM_F", "LOCAL");
+    text("SYSTEM_T", "WGS84");
+    for (const char* axis : {"MAJOR_F", "MINOR_F", "MAJOR_T", "MINOR_T"}) real(axis, 6378137);
+    text("SUB_NAME", "TEST");
+    text("PARENT", "NONE");
+    text("CREATED", "");
+    text("UPDATED", "");
+    real("S_LAT", 50 * 3600);
+    real("N_LAT", 52 * 3600);
+    real("E_LONG", -12 * 3600);
+    real("W_LONG", -10 * 3600);
+    real("LAT_INC", 3600);
+    real("LONG_INC", 3600);
+    integer("GS_COUNT", 9);
+    for (int lat = 50; lat <= 52; ++lat)
+        for (int lon = 12; lon >= 10; --lon) {
+            const auto [dLon, dLat] = shift(lon, lat);
+            for (const float v : {float(dLat), float(dLon), 0.f, 0.f}) append(file, v);
+        }
+    key("END");
+    append(file, 0.0);
     return file;
 }
 
@@ -44,6 +105,8 @@ class GridShifts : public ::testing::Test {
 protected:
     void SetUp() override { OmbRuntime::init(); }
     void TearDown() override { OmbRuntime::shutdown(); }
+
+    void expectInterpolatesAndInverts(OmbGridFileDatumShift& shift) const;
 
     OmbRef<OmbGridFileDatumShift> shift(const std::string& pattern = "*.ct2") const {
         OmbRef<OmbGridFileDatumShift> s(new OmbGridFileDatumShift);
@@ -58,23 +121,31 @@ protected:
     const OmbGeodeticDatum& datum() const { return *OmbGeodeticDatum::wgs84(); }
 };
 
-TEST_F(GridShifts, ShiftsInterpolateAndInvert) {
+TEST_F(GridShifts, BothFormatsInterpolateAndInvert) {
     // A constant latitude shift and a longitude shift growing linearly to
     // the east, which bilinear interpolation reproduces exactly.
-    dir.write("a.ct2", ctable2([](int lon, int) { return std::pair(1.0 * (lon - 10), 2.0); }));
-    const auto s = shift();
+    const NodeShift field = [](int lon, int) { return std::pair(1.0 * (lon - 10), 2.0); };
+    dir.write("a.gsb", ntv2(field));
+    dir.write("a.ct2", ctable2(field));
+    for (const char* format : {"*.gsb", "*.ct2"}) {
+        SCOPED_TRACE(format);
+        expectInterpolatesAndInverts(*shift(format));
+    }
+}
+
+void GridShifts::expectInterpolatesAndInverts(OmbGridFileDatumShift& s) const {
     OmbPoint p(10.5, 51.25, 7);
-    ASSERT_EQ(s->changeDatumToKnownDatum(datum(), p), 0);
+    ASSERT_EQ(s.changeDatumToKnownDatum(datum(), p), 0);
     EXPECT_NEAR(p.x, 10.5 - 0.5 * arcSecond, 1e-9);
     EXPECT_NEAR(p.y, 51.25 + 2 * arcSecond, 1e-9);
     EXPECT_EQ(p.z, 7);
-    ASSERT_EQ(s->changeDatumFromKnownDatum(datum(), p), 0);
+    ASSERT_EQ(s.changeDatumFromKnownDatum(datum(), p), 0);
     EXPECT_NEAR(p.x, 10.5, 1e-9);
     EXPECT_NEAR(p.y, 51.25, 1e-9);
 
     // Stored the other way round, the same grid applies inversely.
-    s->direction = OmbDatumShiftDirection::FromKnownDatum;
-    ASSERT_EQ(s->changeDatumFromKnownDatum(datum(), p), 0);
+    s.direction = OmbDatumShiftDirection::FromKnownDatum;
+    ASSERT_EQ(s.changeDatumFromKnownDatum(datum(), p), 0);
     EXPECT_NEAR(p.x, 10.5 - 0.5 * arcSecond, 1e-9);
     EXPECT_NEAR(p.y, 51.25 + 2 * arcSecond, 1e-9);
 }
@@ -105,6 +176,15 @@ TEST_F(GridShifts, AFallbackUsesTheNextAlternativeOutsideTheGrid) {
     fallback->changeDatumToKnownDatum(datum(), outside);
     EXPECT_NEAR(inside.y, 51 + 2 * arcSecond, 1e-9);
     EXPECT_EQ(outside, OmbPoint(30, 52));
+}
+
+TEST_F(GridShifts, AlaskanGridsReachAcrossTheAntimeridian) {
+    // Alaskan grids are laid out west of -180 degrees.
+    dir.write("alaska.ct2", ctable2([](int, int) { return std::pair(3.0, 2.0); }, -200));
+    OmbPoint p(161, 51);
+    ASSERT_EQ(shift()->changeDatumToKnownDatum(datum(), p), 0);
+    EXPECT_NEAR(p.x, 161 - 3 * arcSecond, 1e-9);
+    EXPECT_NEAR(p.y, 51 + 2 * arcSecond, 1e-9);
 }
 
 TEST_F(GridShifts, OneShiftServesManyThreads) {
