@@ -7,6 +7,8 @@
 
 #include <algorithm>
 #include <cmath>
+#include <optional>
+#include <utility>
 
 namespace {
 
@@ -33,6 +35,77 @@ struct Series {
                     (cosSigma * (-1 + 2 * c2) - b / 6 * cos2SigmaM * (-3 + 4 * sinSigma * sinSigma) * (-3 + 4 * c2)));
     }
 };
+
+// The geodesic leaving a point at a given azimuth, parameterised by its arc
+// sigma on the auxiliary sphere (equations 1-2, 7-8, 10-13).
+class GeodesicLine {
+public:
+    GeodesicLine(const OmbEllipsoid& ellipsoid, double lat1, double alpha1)
+        : b_(ellipsoid.polarRadius()), f_(ellipsoid.flattening()) {
+        const double a = ellipsoid.equatorialRadius();
+        sinAlpha1_ = std::sin(alpha1), cosAlpha1_ = std::cos(alpha1);
+        const double tanU1 = (1 - f_) * std::tan(lat1);
+        cosU1_ = 1 / std::sqrt(1 + tanU1 * tanU1), sinU1_ = tanU1 * cosU1_;
+        sigma1_ = std::atan2(tanU1, cosAlpha1_);
+        sinAlpha_ = cosU1_ * sinAlpha1_;
+        cos2Alpha_ = 1 - sinAlpha_ * sinAlpha_;
+        series_ = Series(cos2Alpha_ * (a * a - b_ * b_) / (b_ * b_));
+    }
+
+    // The arc at which the line is the given distance long.
+    double arcAt(double distance) const {
+        double sigma = distance / (b_ * series_.a);
+        for (int round = 0; round < 100; ++round) {
+            const double next = distance / (b_ * series_.a) + deltaSigma(sigma);
+            const bool settled = std::fabs(next - sigma) <= 1e-12;
+            sigma = next;
+            if (settled) break;
+        }
+        return sigma;
+    }
+    double distance(double sigma) const { return b_ * series_.a * (sigma - deltaSigma(sigma)); }
+    double latitude(double sigma) const {
+        const double sinSigma = std::sin(sigma), cosSigma = std::cos(sigma);
+        const double x = sinU1_ * sinSigma - cosU1_ * cosSigma * cosAlpha1_;
+        return std::atan2(sinU1_ * cosSigma + cosU1_ * sinSigma * cosAlpha1_, (1 - f_) * std::hypot(sinAlpha_, x));
+    }
+    // Longitude east of the start; eastbound lines grow it steadily from 0
+    // to 2 pi over one circuit of the auxiliary sphere.
+    double longitude(double sigma) const {
+        const double sinSigma = std::sin(sigma), cosSigma = std::cos(sigma);
+        double lambda = std::atan2(sinSigma * sinAlpha1_, cosU1_ * cosSigma - sinU1_ * sinSigma * cosAlpha1_);
+        if (sinAlpha1_ > 0 && lambda < 0) lambda += 2 * pi;
+        const double c = f_ / 16 * cos2Alpha_ * (4 + f_ * (4 - 3 * cos2Alpha_));
+        const double cos2SigmaM = std::cos(2 * sigma1_ + sigma);
+        return lambda - (1 - c) * f_ * sinAlpha_ *
+                            (sigma + c * sinSigma * (cos2SigmaM + c * cosSigma * (-1 + 2 * cos2SigmaM * cos2SigmaM)));
+    }
+    double startAzimuth() const { return std::atan2(sinAlpha1_, cosAlpha1_); }
+    // The azimuth in which the line continues at sigma.
+    double azimuth(double sigma) const {
+        return std::atan2(sinAlpha_, cosU1_ * std::cos(sigma) * cosAlpha1_ - sinU1_ * std::sin(sigma));
+    }
+
+private:
+    double deltaSigma(double sigma) const {
+        return series_.deltaSigma(std::sin(sigma), std::cos(sigma), std::cos(2 * sigma1_ + sigma));
+    }
+
+    double b_, f_;
+    double sinAlpha1_, cosAlpha1_, sinU1_, cosU1_, sigma1_, sinAlpha_, cos2Alpha_;
+    Series series_{0};
+};
+
+// Halves [low, high] while goesLow(middle) says the root lies above it.
+template <class F>
+double bisect(double low, double high, F goesLow) {
+    for (int round = 0; round < 64; ++round) {
+        const double middle = (low + high) / 2;
+        if (middle == low || middle == high) break;
+        (goesLow(middle) ? low : high) = middle;
+    }
+    return (low + high) / 2;
+}
 
 }  // namespace
 
@@ -80,41 +153,61 @@ OmbGeodesicInverse Omb_distanceAndAzimuthsVincenty(const OmbEllipsoid& ellipsoid
     return result;
 }
 
+OmbGeodesicInverse Omb_distanceAndAzimuthsExact(const OmbEllipsoid& ellipsoid, const OmbPoint& from,
+                                                const OmbPoint& to) {
+    constexpr double limit = 89.999999999;
+    const double lat1 = std::clamp(from.y, -limit, limit) * toRadians;
+    const double lat2 = std::clamp(to.y, -limit, limit) * toRadians;
+    const double east = std::remainder(to.x - from.x, 360.0);
+    const double dLon = std::fabs(east) * toRadians;
+    // Along a meridian no line crosses the target's meridian, and
+    // Vincenty's iteration settles at once.
+    if (dLon == 0) return Omb_distanceAndAzimuthsVincenty(ellipsoid, from, to);
+
+    // Solved eastwards and mirrored for western targets. Every eastbound
+    // line crosses the target's meridian once per circuit; the latitude of
+    // that crossing falls as the start azimuth turns from north to south,
+    // except near the equator, where either half may hold the answer.
+    const auto arcToMeridian = [&](const GeodesicLine& line) {
+        return bisect(0, 2 * pi, [&](double sigma) { return line.longitude(sigma) < dLon; });
+    };
+    const auto missBy = [&](const GeodesicLine& line, double sigma) { return line.latitude(sigma) - lat2; };
+    std::optional<std::pair<GeodesicLine, double>> best;  // the line and the target's arc
+    const auto consider = [&](const GeodesicLine& line, double sigma) {
+        if (std::fabs(missBy(line, sigma)) > 1e-10) return;
+        if (!best || line.distance(sigma) < best->first.distance(best->second)) best.emplace(line, sigma);
+    };
+    for (const auto [low, high] : {std::pair(0.0, pi / 2), std::pair(pi / 2, pi)}) {
+        const double alpha = bisect(low, high, [&](double alpha) {
+            const GeodesicLine line(ellipsoid, lat1, alpha);
+            return missBy(line, arcToMeridian(line)) > 0;
+        });
+        const GeodesicLine line(ellipsoid, lat1, alpha);
+        consider(line, arcToMeridian(line));
+    }
+    if (dLon == pi) {  // straight over either pole
+        const double u1 = std::atan((1 - ellipsoid.flattening()) * std::tan(lat1));
+        const double u2 = std::atan((1 - ellipsoid.flattening()) * std::tan(lat2));
+        consider(GeodesicLine(ellipsoid, lat1, 0), pi - u1 - u2);
+        consider(GeodesicLine(ellipsoid, lat1, pi), pi + u1 + u2);
+    }
+    OmbGeodesicInverse result;
+    if (!best) {
+        result.converged = false;
+        return result;
+    }
+    const auto& [line, sigma] = *best;
+    result.distance = line.distance(sigma);
+    const double mirror = east < 0 ? -1 : 1;
+    result.azimuth = normalizedAzimuth(mirror * line.startAzimuth());
+    result.backAzimuth = normalizedAzimuth(mirror * line.azimuth(sigma) + pi);
+    return result;
+}
+
 OmbPoint Omb_pointPlusDirectedDistance(const OmbEllipsoid& ellipsoid, const OmbPoint& from, double azimuth,
                                        double distance) {
-    const double a = ellipsoid.equatorialRadius();
-    const double b = ellipsoid.polarRadius();
-    const double f = ellipsoid.flattening();
-    const double alpha1 = azimuth * toRadians;
-    const double sinAlpha1 = std::sin(alpha1), cosAlpha1 = std::cos(alpha1);
-    const double tanU1 = (1 - f) * std::tan(from.y * toRadians);
-    const double cosU1 = 1 / std::sqrt(1 + tanU1 * tanU1), sinU1 = tanU1 * cosU1;
-    const double sigma1 = std::atan2(tanU1, cosAlpha1);
-    const double sinAlpha = cosU1 * sinAlpha1;
-    const double cos2Alpha = 1 - sinAlpha * sinAlpha;
-    const Series series(cos2Alpha * (a * a - b * b) / (b * b));
-    double sigma = distance / (b * series.a);
-    double cos2SigmaM = 0, sinSigma = 0, cosSigma = 0;
-    for (int round = 0; round < 100; ++round) {
-        cos2SigmaM = std::cos(2 * sigma1 + sigma);
-        sinSigma = std::sin(sigma);
-        cosSigma = std::cos(sigma);
-        const double next = distance / (b * series.a) + series.deltaSigma(sinSigma, cosSigma, cos2SigmaM);
-        const bool settled = std::fabs(next - sigma) <= 1e-12;
-        sigma = next;
-        if (settled) break;
-    }
-    sinSigma = std::sin(sigma);
-    cosSigma = std::cos(sigma);
-    cos2SigmaM = std::cos(2 * sigma1 + sigma);
-    const double x = sinU1 * sinSigma - cosU1 * cosSigma * cosAlpha1;
-    const double lat2 = std::atan2(sinU1 * cosSigma + cosU1 * sinSigma * cosAlpha1, (1 - f) * std::hypot(sinAlpha, x));
-    const double lambda = std::atan2(sinSigma * sinAlpha1, cosU1 * cosSigma - sinU1 * sinSigma * cosAlpha1);
-    const double c = f / 16 * cos2Alpha * (4 + f * (4 - 3 * cos2Alpha));
-    const double l =
-        lambda - (1 - c) * f * sinAlpha *
-                     (sigma + c * sinSigma * (cos2SigmaM + c * cosSigma * (-1 + 2 * cos2SigmaM * cos2SigmaM)));
-    double lon2 = from.x + l / toRadians;
-    lon2 = std::remainder(lon2, 360.0);
-    return {lon2, lat2 / toRadians, from.z};
+    const GeodesicLine line(ellipsoid, from.y * toRadians, azimuth * toRadians);
+    const double sigma = line.arcAt(distance);
+    const double lon2 = std::remainder(from.x + line.longitude(sigma) / toRadians, 360.0);
+    return {lon2, line.latitude(sigma) / toRadians, from.z};
 }

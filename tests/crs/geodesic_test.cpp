@@ -47,10 +47,13 @@ TEST(Geodesic, InverseAndDirectAgreeWithGeographicLib) {
     }
     const auto exact = geodSolve("-i", lines);
     ASSERT_EQ(exact.size(), pairs.size()) << "GeodSolve (geographiclib-tools) is needed";
-    double distance = 0, azimuth = 0;
+    double distance = 0, azimuth = 0, exactDistance = 0;
     int unsettled = 0;
     std::vector<std::string> directLines;
     for (std::size_t i = 0; i < pairs.size(); ++i) {
+        // The root finder serves ordinary pairs as well.
+        const OmbGeodesicInverse e = Omb_distanceAndAzimuthsExact(wgs84, pairs[i].first, pairs[i].second);
+        exactDistance = std::max(exactDistance, std::fabs(e.distance - exact[i][2]));
         const OmbGeodesicInverse g = Omb_distanceAndAzimuthsVincenty(wgs84, pairs[i].first, pairs[i].second);
         if (!g.converged) {
             ++unsettled;
@@ -64,6 +67,7 @@ TEST(Geodesic, InverseAndDirectAgreeWithGeographicLib) {
         directLines.push_back(line);
     }
     EXPECT_LT(distance, 1e-3) << "metres";
+    EXPECT_LT(exactDistance, 1e-3) << "metres";
     EXPECT_LT(azimuth, 1e-7) << "degrees";
     EXPECT_LT(unsettled, 10) << "nearly antipodal pairs";
 
@@ -82,6 +86,37 @@ TEST(Geodesic, InverseAndDirectAgreeWithGeographicLib) {
     EXPECT_LT(position, 1e-8) << "degrees";
 }
 
+TEST(Geodesic, NearlyAntipodalPointsAreSolvedExactly) {
+    const OmbEllipsoid wgs84;
+    std::mt19937 random(1975);
+    std::uniform_real_distribution<double> lon(-180, 180), lat(-60, 60), near(-0.6, 0.6);
+    std::vector<std::pair<OmbPoint, OmbPoint>> pairs;
+    std::vector<std::string> lines;
+    char line[160];
+    for (int i = 0; i < 300; ++i) {
+        // Every third pair starts near the equator, where several lines reach the target.
+        const OmbPoint a(lon(random), i % 3 ? lat(random) : near(random) / 10);
+        const OmbPoint b(std::remainder(a.x + 180 + near(random), 360.0), -a.y + near(random) / (i % 3 ? 1 : 10));
+        pairs.emplace_back(a, b);
+        std::snprintf(line, sizeof line, "%.12f %.12f %.12f %.12f", a.y, a.x, b.y, b.x);
+        lines.push_back(line);
+    }
+    const auto exact = geodSolve("-i", lines);
+    ASSERT_EQ(exact.size(), pairs.size()) << "GeodSolve (geographiclib-tools) is needed";
+    double distance = 0, azimuth = 0;
+    int unsettled = 0;
+    for (std::size_t i = 0; i < pairs.size(); ++i) {
+        unsettled += !Omb_distanceAndAzimuthsVincenty(wgs84, pairs[i].first, pairs[i].second).converged;
+        const OmbGeodesicInverse g = Omb_distanceAndAzimuthsExact(wgs84, pairs[i].first, pairs[i].second);
+        distance = std::max(distance, std::fabs(g.distance - exact[i][2]));
+        azimuth = std::max(
+            {azimuth, angleDifference(g.azimuth, exact[i][0]), angleDifference(g.backAzimuth, exact[i][1] + 180)});
+    }
+    EXPECT_GT(unsettled, 30) << "the sample should reach where Vincenty's iteration fails";
+    EXPECT_LT(distance, 1e-3) << "metres";
+    EXPECT_LT(azimuth, 1e-6) << "degrees";
+}
+
 TEST(Geodesic, EdgeCases) {
     const OmbEllipsoid wgs84;
     const OmbGeodesicInverse same = Omb_distanceAndAzimuthsVincenty(wgs84, OmbPoint(10, 20), OmbPoint(10, 20));
@@ -94,6 +129,14 @@ TEST(Geodesic, EdgeCases) {
     EXPECT_NEAR(equator.distance, 111319.49079327357, 1e-6);
     EXPECT_NEAR(equator.azimuth, 90, 1e-12);
     EXPECT_NEAR(equator.backAzimuth, 270, 1e-12);
+    // Meridian arcs, and exact antipodes, where the shortest way runs over a pole.
+    const OmbGeodesicInverse meridian = Omb_distanceAndAzimuthsExact(wgs84, OmbPoint(10, 20), OmbPoint(10, -30));
+    EXPECT_NEAR(meridian.distance, Omb_distanceAndAzimuthsVincenty(wgs84, OmbPoint(10, 20), OmbPoint(10, -30)).distance,
+                1e-9);
+    EXPECT_EQ(meridian.azimuth, 180);
+    const OmbGeodesicInverse antipodes = Omb_distanceAndAzimuthsExact(wgs84, OmbPoint(0, 0), OmbPoint(180, 0));
+    EXPECT_FALSE(Omb_distanceAndAzimuthsVincenty(wgs84, OmbPoint(0, 0), OmbPoint(180, 0)).converged);
+    EXPECT_NEAR(antipodes.distance, 20003931.4586, 1e-3);
     // A pole is approached, not reached: latitudes are clamped.
     EXPECT_TRUE(std::isfinite(Omb_distanceAndAzimuthsVincenty(wgs84, OmbPoint(0, 90), OmbPoint(0, -90)).distance));
 }
