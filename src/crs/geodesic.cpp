@@ -177,7 +177,7 @@ OmbGeodesicInverse Omb_distanceAndAzimuthsExact(const OmbEllipsoid& ellipsoid, c
         if (std::fabs(missBy(line, sigma)) > 1e-10) return;
         if (!best || line.distance(sigma) < best->first.distance(best->second)) best.emplace(line, sigma);
     };
-    for (const auto [low, high] : {std::pair(0.0, pi / 2), std::pair(pi / 2, pi)}) {
+    for (const auto& [low, high] : {std::pair(0.0, pi / 2), std::pair(pi / 2, pi)}) {
         const double alpha = bisect(low, high, [&](double alpha) {
             const GeodesicLine line(ellipsoid, lat1, alpha);
             return missBy(line, arcToMeridian(line)) > 0;

@@ -7,11 +7,12 @@
 
 #include <cmath>
 #include <cstdio>
-#include <fstream>
 #include <random>
 #include <sstream>
 #include <string>
 #include <vector>
+
+#include "referencetool.h"
 
 namespace {
 
@@ -28,18 +29,7 @@ struct Point {
 // Runs GeographicLib's CartConvert (exact conversions on WGS 84) over the
 // lines and returns its output lines.
 std::vector<std::string> cartConvert(const std::vector<std::string>& lines, bool reverse) {
-    const std::string input = ::testing::TempDir() + "/cartconvert-in.txt";
-    const std::string output = ::testing::TempDir() + "/cartconvert-out.txt";
-    std::ofstream in(input);
-    for (const std::string& line : lines) in << line << "\n";
-    in.close();
-    const std::string command =
-        std::string("CartConvert -p 9 ") + (reverse ? "-r " : "") + "< " + input + " > " + output;
-    if (std::system(command.c_str()) != 0) return {};
-    std::ifstream out(output);
-    std::vector<std::string> result;
-    for (std::string line; std::getline(out, line);) result.push_back(line);
-    return result;
+    return runReferenceTool(reverse ? "CartConvert -p 9 -r" : "CartConvert -p 9", lines);
 }
 
 std::vector<Point> randomPoints(int count) {

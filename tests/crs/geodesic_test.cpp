@@ -4,24 +4,23 @@
 
 #include <cmath>
 #include <cstdio>
-#include <fstream>
 #include <random>
+#include <sstream>
 #include <string>
 #include <vector>
+
+#include "referencetool.h"
 
 namespace {
 
 // GeographicLib's GeodSolve (exact) over the lines; its output lines.
 std::vector<std::vector<double>> geodSolve(const std::string& options, const std::vector<std::string>& lines) {
-    const std::string input = ::testing::TempDir() + "/geodsolve-in.txt";
-    const std::string output = ::testing::TempDir() + "/geodsolve-out.txt";
-    std::ofstream in(input);
-    for (const std::string& line : lines) in << line << "\n";
-    in.close();
     std::vector<std::vector<double>> rows;
-    if (std::system(("GeodSolve -p 9 " + options + " < " + input + " > " + output).c_str()) != 0) return rows;
-    std::ifstream out(output);
-    for (double a, b, c; out >> a >> b >> c;) rows.push_back({a, b, c});
+    for (const std::string& line : runReferenceTool("GeodSolve -p 9 " + options, lines)) {
+        std::istringstream fields(line);
+        double a, b, c;
+        if (fields >> a >> b >> c) rows.push_back({a, b, c});
+    }
     return rows;
 }
 

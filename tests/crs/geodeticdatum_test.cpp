@@ -7,13 +7,13 @@
 
 #include <cmath>
 #include <cstdio>
-#include <fstream>
 #include <random>
 #include <sstream>
 #include <string>
 #include <vector>
 
 #include "../errortext.h"
+#include "referencetool.h"
 
 namespace {
 
@@ -43,20 +43,18 @@ OmbHelmertDatumShift::Parameters osgb() {
 
 // PROJ's cs2cs over "lon lat h" lines.
 std::vector<OmbPoint> cs2cs(const std::string& from, const std::string& to, const std::vector<OmbPoint>& points) {
-    const std::string input = ::testing::TempDir() + "/cs2cs-in.txt";
-    const std::string output = ::testing::TempDir() + "/cs2cs-out.txt";
-    std::ofstream in(input);
+    std::vector<std::string> lines;
     char line[128];
     for (const OmbPoint& p : points) {
-        std::snprintf(line, sizeof line, "%.12f %.12f %.4f\n", p.x, p.y, p.z);
-        in << line;
+        std::snprintf(line, sizeof line, "%.12f %.12f %.4f", p.x, p.y, p.z);
+        lines.push_back(line);
     }
-    in.close();
-    const std::string command = "cs2cs -f %.12f " + from + " +to " + to + " < " + input + " > " + output;
     std::vector<OmbPoint> out;
-    if (std::system(command.c_str()) != 0) return out;
-    std::ifstream result(output);
-    for (OmbPoint p; result >> p.x >> p.y >> p.z;) out.push_back(p);
+    for (const std::string& row : runReferenceTool("cs2cs -f %.12f " + from + " +to " + to, lines)) {
+        std::istringstream fields(row);
+        OmbPoint p;
+        if (fields >> p.x >> p.y >> p.z) out.push_back(p);
+    }
     return out;
 }
 
