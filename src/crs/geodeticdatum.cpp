@@ -93,6 +93,27 @@ void OmbGeodeticDatum::changeDatumTo(const OmbGeodeticDatum& target, OmbPoint& p
     for (std::size_t i = to.size() - 1; i-- > 0;) to[i]->datumShift_->changeDatumFromKnownDatum(*to[i], p);
 }
 
+bool OmbGeodeticDatum::changeDatumTo(const OmbGeodeticDatum& target, const OmbRect& in, OmbRect& out) const {
+    // Datum shifts bend edges only slightly; eight pieces per edge follow them.
+    constexpr int piecesPerEdge = 8;
+    OmbRect converted = OmbRect::invalid();
+    try {
+        for (int i = 0; i < piecesPerEdge; ++i) {
+            const double t = double(i) / piecesPerEdge;
+            const double x = in.xmin + t * in.width(), y = in.ymin + t * in.height();
+            for (OmbPoint p : {OmbPoint(x, in.ymin), OmbPoint(in.xmax - (x - in.xmin), in.ymax),
+                               OmbPoint(in.xmin, in.ymax - (y - in.ymin)), OmbPoint(in.xmax, y)}) {
+                changeDatumTo(target, p);
+                converted.include(p);
+            }
+        }
+    } catch (const OmbException&) {
+        return false;
+    }
+    out = converted;
+    return true;
+}
+
 const OmbRef<OmbGeodeticDatum>& OmbGeodeticDatum::wgs84() { return wgs84Datum; }
 
 void OmbGeodeticDatum::createPredefined() {

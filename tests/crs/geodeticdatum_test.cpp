@@ -145,6 +145,23 @@ TEST_F(Datums, OtherShiftsAndTheWalk) {
     EXPECT_FALSE(shifted->isWgs84Equivalent());
 }
 
+TEST_F(Datums, RectanglesCoverEveryConvertedPoint) {
+    const auto osgb36 = helmertDatum(OmbEllipsoid::airy1830(), osgb());
+    const OmbRect in(-6, 50, 2, 58);
+    OmbRect out;
+    ASSERT_TRUE(osgb36->changeDatumTo(*OmbGeodeticDatum::wgs84(), in, out));
+    for (double x = in.xmin; x <= in.xmax; x += 0.5)
+        for (double y = in.ymin; y <= in.ymax; y += 0.5) {
+            OmbPoint p(x, y);
+            osgb36->changeDatumTo(*OmbGeodeticDatum::wgs84(), p);
+            EXPECT_TRUE(out.inside(p)) << x << " " << y;
+        }
+    // Unconnected datums fail without touching the result.
+    const OmbRect before = out;
+    EXPECT_FALSE(OmbGeodeticDatum().changeDatumTo(*OmbGeodeticDatum::wgs84(), in, out));
+    EXPECT_EQ(out, before);
+}
+
 TEST_F(Datums, FallbackShiftsCheckTheirAlternatives) {
     OmbRef<OmbFallbackDatumShift> fallback(new OmbFallbackDatumShift);
     fallback->name(OmbString("F"));

@@ -8,6 +8,7 @@
 #include <oecore/crs/datumshift.h>
 #include <oecore/crs/ellipsoid.h>
 #include <oecore/crs/primemeridian.h>
+#include <oecore/linalg/rect.h>
 
 class OmbGeodeticDatum : public OmbResourceObject {
     OMB_DECLARE_ENGINE_CLASS()
@@ -43,6 +44,9 @@ public:
     // target, walking both to the pivot; OmbXUnconnectedDatums when their
     // pivots differ.
     void changeDatumTo(const OmbGeodeticDatum& target, OmbPoint& p) const;
+    // The bounds of the rectangle's corners and of points along its edges,
+    // converted; false, with out untouched, when any of them fails.
+    bool changeDatumTo(const OmbGeodeticDatum& target, const OmbRect& in, OmbRect& out) const;
 
     // The WGS 84 pivot, while the runtime is initialised ("Datums.Wgs84").
     static const OmbRef<OmbGeodeticDatum>& wgs84();
