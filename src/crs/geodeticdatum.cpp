@@ -2,6 +2,8 @@
 #include <oecore/core/runtime.h>
 #include <oecore/crs/geodeticdatum.h>
 
+#include <optional>
+#include <utility>
 #include <vector>
 
 OMB_DEFINE_ENGINE_CLASS(OmbGeodeticDatum, OmbResourceObject, "GeodeticDatum", 0)
@@ -72,45 +74,72 @@ bool OmbGeodeticDatum::isWgs84Equivalent() const {
     return datumShift_ && datumShift_->knownDatum() == wgs84 && datumShift_->zeroShifts();
 }
 
-void OmbGeodeticDatum::changeDatumTo(const OmbGeodeticDatum& target, OmbPoint& p) const {
-    if (this == &target) return;
-    const std::vector<const OmbGeodeticDatum*> from = chainToPivot(*this);
-    const std::vector<const OmbGeodeticDatum*> to = chainToPivot(target);
-    if (!endsAtPivot(from) || !endsAtPivot(to) || from.back() != to.back())
-        OMB_THROW(UnconnectedDatums, name(), target.name());
+namespace {
 
-    // Two Helmert shifts to one known datum: one geocentric map.
-    const auto* sourceShift = dynamic_cast<const OmbHelmertDatumShift*>(datumShift_.get());
-    const auto* targetShift = dynamic_cast<const OmbHelmertDatumShift*>(target.datumShift_.get());
-    if (sourceShift && targetShift && sourceShift->knownDatum() == targetShift->knownDatum()) {
-        const OmbGeocentricTransform map = targetShift->fromKnown().after(sourceShift->toKnown());
-        ellipsoid_->geodeticToGeocentricXYZ(p.x, p.y, p.z);
-        map.apply(p.x, p.y, p.z);
-        target.ellipsoid_->geocentricXYZToGeodetic(p.x, p.y, p.z);
-        return;
+// How points travel from one datum to another, worked out once for all the
+// points of a call: up the source's chain of shifts to the pivot and down
+// the target's, or one geocentric map when both datums have Helmert shifts
+// to the same datum.
+class DatumRoute {
+public:
+    DatumRoute(const OmbGeodeticDatum& source, const OmbGeodeticDatum& target)
+        : source_(source), target_(target), up_(chainToPivot(source)), down_(chainToPivot(target)) {
+        if (!endsAtPivot(up_) || !endsAtPivot(down_) || up_.back() != down_.back())
+            OMB_THROW(UnconnectedDatums, source.name(), target.name());
+        const auto* from = dynamic_cast<const OmbHelmertDatumShift*>(source.datumShift().get());
+        const auto* to = dynamic_cast<const OmbHelmertDatumShift*>(target.datumShift().get());
+        if (from && to && from->knownDatum() == to->knownDatum()) helmert_ = to->fromKnown().after(from->toKnown());
     }
-    for (std::size_t i = 0; i + 1 < from.size(); ++i) from[i]->datumShift_->changeDatumToKnownDatum(*from[i], p);
-    for (std::size_t i = to.size() - 1; i-- > 0;) to[i]->datumShift_->changeDatumFromKnownDatum(*to[i], p);
+
+    void apply(OmbPoint& p) const {
+        if (helmert_) {
+            source_.ellipsoid()->geodeticToGeocentricXYZ(p.x, p.y, p.z);
+            helmert_->apply(p.x, p.y, p.z);
+            target_.ellipsoid()->geocentricXYZToGeodetic(p.x, p.y, p.z);
+            return;
+        }
+        for (std::size_t i = 0; i + 1 < up_.size(); ++i) up_[i]->datumShift()->changeDatumToKnownDatum(*up_[i], p);
+        for (std::size_t i = down_.size() - 1; i-- > 0;)
+            down_[i]->datumShift()->changeDatumFromKnownDatum(*down_[i], p);
+    }
+
+private:
+    const OmbGeodeticDatum& source_;
+    const OmbGeodeticDatum& target_;
+    std::vector<const OmbGeodeticDatum*> up_, down_;
+    std::optional<OmbGeocentricTransform> helmert_;
+};
+
+}  // namespace
+
+void OmbGeodeticDatum::changeDatumTo(const OmbGeodeticDatum& target, OmbPoint& p) const {
+    if (this != &target) DatumRoute(*this, target).apply(p);
+}
+
+void OmbGeodeticDatum::changeDatumTo(const OmbGeodeticDatum& target, OmbPointArray& points) const {
+    if (this == &target || points.empty()) return;
+    const DatumRoute route(*this, target);
+    for (OmbPoint& p : points) route.apply(p);
 }
 
 bool OmbGeodeticDatum::changeDatumTo(const OmbGeodeticDatum& target, const OmbRect& in, OmbRect& out) const {
     // Datum shifts bend edges only slightly; eight pieces per edge follow them.
     constexpr int piecesPerEdge = 8;
-    OmbRect converted = OmbRect::invalid();
+    OmbPointArray outline;
+    outline.reserve(4 * piecesPerEdge);
+    for (int i = 0; i < piecesPerEdge; ++i) {
+        const double dx = i * in.width() / piecesPerEdge, dy = i * in.height() / piecesPerEdge;
+        for (const OmbPoint& p : {OmbPoint(in.xmin + dx, in.ymin), OmbPoint(in.xmax, in.ymin + dy),
+                                  OmbPoint(in.xmax - dx, in.ymax), OmbPoint(in.xmin, in.ymax - dy)})
+            outline.push_back(p);
+    }
     try {
-        for (int i = 0; i < piecesPerEdge; ++i) {
-            const double t = double(i) / piecesPerEdge;
-            const double x = in.xmin + t * in.width(), y = in.ymin + t * in.height();
-            for (OmbPoint p : {OmbPoint(x, in.ymin), OmbPoint(in.xmax - (x - in.xmin), in.ymax),
-                               OmbPoint(in.xmin, in.ymax - (y - in.ymin)), OmbPoint(in.xmax, y)}) {
-                changeDatumTo(target, p);
-                converted.include(p);
-            }
-        }
+        changeDatumTo(target, outline);
     } catch (const OmbException&) {
         return false;
     }
-    out = converted;
+    out = OmbRect::invalid();
+    for (const OmbPoint& p : std::as_const(outline)) out.include(p);
     return true;
 }
 

@@ -145,6 +145,23 @@ TEST_F(Datums, OtherShiftsAndTheWalk) {
     EXPECT_FALSE(shifted->isWgs84Equivalent());
 }
 
+TEST_F(Datums, ArraysConvertLikeTheirPoints) {
+    const auto osgb36 = helmertDatum(OmbEllipsoid::airy1830(), osgb(), "OSGB36");
+    OmbRef<OmbLoLaOffsetsDatumShift> offsets(new OmbLoLaOffsetsDatumShift);
+    offsets->longitudeOffset = 0.5;
+    OmbGeodeticDatum shifted(OmbEllipsoid::airy1830(), OmbPrimeMeridian::greenwich(), offsets);
+    for (const OmbGeodeticDatum* target : {OmbGeodeticDatum::wgs84().get(), &shifted}) {
+        OmbPointArray points{{-2, 53, 100}, {1, 51, 0}, {-5, 58, -20}};
+        const OmbPointArray original = points;
+        osgb36->changeDatumTo(*target, points);
+        for (std::size_t i = 0; i < points.size(); ++i) {
+            OmbPoint p = original[i];
+            osgb36->changeDatumTo(*target, p);
+            EXPECT_EQ(points[i], p);
+        }
+    }
+}
+
 TEST_F(Datums, RectanglesCoverEveryConvertedPoint) {
     const auto osgb36 = helmertDatum(OmbEllipsoid::airy1830(), osgb());
     const OmbRect in(-6, 50, 2, 58);

@@ -8,6 +8,7 @@
 #include <oecore/crs/datumshift.h>
 #include <oecore/crs/ellipsoid.h>
 #include <oecore/crs/primemeridian.h>
+#include <oecore/linalg/pointarray.h>
 #include <oecore/linalg/rect.h>
 
 class OmbGeodeticDatum : public OmbResourceObject {
@@ -44,6 +45,8 @@ public:
     // target, walking both to the pivot; OmbXUnconnectedDatums when their
     // pivots differ.
     void changeDatumTo(const OmbGeodeticDatum& target, OmbPoint& p) const;
+    // Every point of the array, along one route.
+    void changeDatumTo(const OmbGeodeticDatum& target, OmbPointArray& points) const;
     // The bounds of the rectangle's corners and of points along its edges,
     // converted; false, with out untouched, when any of them fails.
     bool changeDatumTo(const OmbGeodeticDatum& target, const OmbRect& in, OmbRect& out) const;
