@@ -390,9 +390,11 @@ OmbDatumShiftStatus OmbGridFileDatumShift::convert(OmbPoint& p, bool forward) co
     constexpr double toRadians = M_PI / 180;
     const PJ_COORD in = proj_coord(lon * toRadians, p.y * toRadians, 0, 0);
     const PJ_COORD out = proj_trans(g.transform, forward ? PJ_FWD : PJ_INV, in);
+    // PROJ reports points outside every grid as errors. A point that comes
+    // back unchanged lies where the grids shift by nothing: it is covered.
     const bool failed = proj_errno(g.transform) != 0 || out.lp.lam == HUGE_VAL;
     proj_errno_reset(g.transform);
-    if (failed || (out.lp.lam == in.lp.lam && out.lp.phi == in.lp.phi)) return 1;
+    if (failed) return 1;
     p.x = out.lp.lam / toRadians;
     if (p.x < -180) p.x += 360;
     p.y = out.lp.phi / toRadians;

@@ -159,6 +159,12 @@ TEST_F(GridShifts, PointsOutsideTheGridsAreReportedAndKept) {
     EXPECT_EQ(errorOf([&] { s->changeDatumFromKnownDatum(datum(), p); }),
               "Can't transform Lon = 20, Lat = 51 using GridFileDatumShift G, because the point is not covered by "
               "the grid files.");
+
+    // Inside a grid that shifts by nothing the point is covered.
+    dir.write("zero.ct2", ctable2([](int, int) { return std::pair(0.0, 0.0); }));
+    OmbPoint unmoved(11, 51);
+    EXPECT_EQ(shift("zero.ct2")->changeDatumToKnownDatumNoExceptions(datum(), unmoved), 0);
+    EXPECT_EQ(unmoved, OmbPoint(11, 51));
 }
 
 TEST_F(GridShifts, AFallbackUsesTheNextAlternativeOutsideTheGrid) {
