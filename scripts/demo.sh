@@ -11,3 +11,5 @@ echo
 "$omb" info "$root/data/demo/harbour.px" --param 'berths=depth >= 12'
 echo
 "$omb" expr 'kind = #berth and depth >= 9.5' kind=#berth depth=11.2
+echo
+"$omb" datum "$root/data/demo/harbour.px" OSGB36 Datums.Wgs84 -2,53,100 -0.1276,51.5072

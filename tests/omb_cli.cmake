@@ -60,3 +60,11 @@ expect("expr;a;a=harbour" 2 "'a=harbour' is not NAME=VALUE with a literal value"
 
 # The bundled demo loads.
 expect("info;${DEMO}" 0 "Harbour.OSGB36  GeodeticDatum\n3 public objects")
+
+# Datum changes between a datum of the demo and the predefined WGS 84.
+expect("datum;${DEMO};OSGB36;Datums.Wgs84;-2,53,100;1.5,51.2" 0
+       "^-2\\.00144882[0-9] 53\\.00030801[0-9] 149\\.847[0-9]\n1\\.49822296[0-9] 51\\.20057303[0-9] 43\\.447[0-9]\n$")
+expect("datum;${DEMO};Datums.Wgs84;OSGB36;-2.001448828,53.000308016,149.8475" 0 "^-2\\.00000000[0-9] 53\\.00000000[0-9] 100\\.000")
+expect("datum;${DEMO};OSGB36;Nowhere;1,2" 1 "no geodetic datum named 'Nowhere'")
+expect("datum;${DEMO};OSGB36;Datums.Wgs84;1,x" 2 "'1,x' is not LON,LAT or LON,LAT,H")
+expect("datum;${DEMO};OSGB36" 2 "datum takes FILE.px FROM TO")

@@ -48,6 +48,8 @@
 #include <oecore/attr/visenums.h>
 
 #include <oecore/linalg/point.h>
+#include <oecore/linalg/pointarray.h>
+#include <oecore/linalg/rect.h>
 
 #include <oecore/crs/datumshift.h>
 #include <oecore/crs/ellipsoid.h>

@@ -2,9 +2,12 @@
 #include <oecore/oecore.h>
 
 #include <clocale>
+#include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <iostream>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace {
@@ -20,6 +23,9 @@ void printHelp(std::ostream& out) {
            "  expr 'EXPRESSION' [NAME=VALUE]...\n"
            "                         evaluate an expression against attributes given as literals\n"
            "                         (3, 2.5, \"text\", #atom, true), printing the value and its type\n"
+           "  datum FILE.px FROM TO LON,LAT[,H]...\n"
+           "                         move points (degrees, height in metres) from one geodetic datum\n"
+           "                         to another; datums by public name or predefined (Datums.Wgs84)\n"
            "\n"
            "Options:\n"
            "  --param KEY=VALUE  a configuration parameter for ConfigurationParameter (repeatable)\n"
@@ -171,8 +177,62 @@ int evaluateExpression(const Options& options) {
     return 0;
 }
 
+// A datum by its public name in the configuration or by its predefined name.
+OmbRef<OmbGeodeticDatum> findDatum(const OmbConfiguration& configuration, const std::string& name) {
+    OmbRef<OmbEngineObject> object = configuration.getPublicObject(OmbString(name));
+    if (!object) object = OmbRuntime::getPredefinedObject(OmbString(name));
+    return omb_dynamic_cast<OmbGeodeticDatum>(object);
+}
+
+// "lon,lat" or "lon,lat,h", all numbers.
+bool parsePoint(const std::string& text, OmbPoint& p) {
+    const char* at = text.c_str();
+    for (std::size_t i = 0; i < 3; ++i) {
+        char* end = nullptr;
+        p[i] = std::strtod(at, &end);
+        if (end == at) return false;
+        if (*end == '\0') return i >= 1;
+        if (*end != ',') return false;
+        at = end + 1;
+    }
+    return false;
+}
+
+int convertDatum(const Options& options) {
+    if (options.files.size() < 4) {
+        std::cerr << "omb: datum takes FILE.px FROM TO and at least one LON,LAT[,H]; see 'omb --help'\n";
+        return 2;
+    }
+    OmbPointArray points;
+    for (std::size_t i = 3; i < options.files.size(); ++i) {
+        OmbPoint p;
+        if (!parsePoint(options.files[i], p)) {
+            std::cerr << "omb: '" << options.files[i] << "' is not LON,LAT or LON,LAT,H\n";
+            return 2;
+        }
+        points.push_back(p);
+    }
+    const OmbRef<OmbConfiguration> configuration = loadConfiguration(options);
+    OmbRef<OmbGeodeticDatum> datums[2];
+    for (int i = 0; i < 2; ++i) {
+        datums[i] = findDatum(*configuration, options.files[1 + i]);
+        if (!datums[i]) {
+            std::cerr << "omb: " << options.files[0] << ": no geodetic datum named '" << options.files[1 + i] << "'\n";
+            return 1;
+        }
+    }
+    datums[0]->changeDatumTo(*datums[1], points);
+    char line[96];
+    for (const OmbPoint& p : std::as_const(points)) {
+        std::snprintf(line, sizeof line, "%.9f %.9f %.4f\n", p.x, p.y, p.z);
+        std::cout << line;
+    }
+    return 0;
+}
+
 int run(const Options& options) {
     if (options.command == "expr") return evaluateExpression(options);
+    if (options.command == "datum") return convertDatum(options);
     if (options.command == "info" && options.files.empty()) {
         std::cout << "OECore " << OmbRuntime::version() << "\n";
         printClasses(std::cout);
