@@ -74,19 +74,22 @@ void OmbEllipsoid::geodeticToGeocentricXYZ(double& lon, double& lat, double& h) 
 }
 
 void OmbEllipsoid::geocentricXYZToGeodetic(double& x, double& y, double& z) const {
-    // One Bowring step, no iteration.
-    const double p = std::hypot(x, y);
-    const double theta = std::atan2(z * a_, b_ * p);
-    const double sinTheta = std::sin(theta);
-    const double cosTheta = std::cos(theta);
+    // One Bowring step, no iteration. The sines and cosines of the auxiliary
+    // angle theta and of the latitude come from the sides of their triangles
+    // rather than from trigonometric calls, and plain square roots serve for
+    // the lengths (geocentric coordinates are far from overflow): array
+    // conversions spend most of their time here.
+    const double p = std::sqrt(x * x + y * y);
+    const double thetaY = z * a_, thetaX = b_ * p, thetaR = std::sqrt(thetaY * thetaY + thetaX * thetaX);
+    const double sinTheta = thetaY / thetaR, cosTheta = thetaX / thetaR;
     const double ep2 = a_ * a_ / (b_ * b_) - 1;
-    const double phi =
-        std::atan2(z + ep2 * b_ * sinTheta * sinTheta * sinTheta, p - e2_ * a_ * cosTheta * cosTheta * cosTheta);
-    const double sinPhi = std::sin(phi);
-    const double h = p / std::cos(phi) - a_ / std::sqrt(1 - e2_ * sinPhi * sinPhi);
-    const double lambda = std::atan2(y, x);
-    x = lambda * degrees;
-    y = phi * degrees;
+    const double phiY = z + ep2 * b_ * sinTheta * sinTheta * sinTheta;
+    const double phiX = p - e2_ * a_ * cosTheta * cosTheta * cosTheta;
+    const double phiR = std::sqrt(phiY * phiY + phiX * phiX);
+    const double sinPhi = phiY / phiR, cosPhi = phiX / phiR;
+    const double h = p / cosPhi - a_ / std::sqrt(1 - e2_ * sinPhi * sinPhi);
+    x = std::atan2(y, x) * degrees;
+    y = std::atan2(phiY, phiX) * degrees;
     z = h;
 }
 
