@@ -25,5 +25,5 @@ fuzz loadstring 60 corpus
 fuzz expression 30 expressions
 
 bash "$root/scripts/build.sh" tsan -DCMAKE_BUILD_TYPE=Debug -DOECORE_SANITIZE=thread \
-  -DOECORE_BUILD_BENCHMARKS=OFF -- --target test_core_concurrency
+  -DOECORE_BUILD_BENCHMARKS=OFF -- --target test_core_concurrency test_crs_concurrency
 TSAN_OPTIONS=halt_on_error=1 ctest --test-dir "$root/build/tsan" -L concurrency --output-on-failure
