@@ -12,6 +12,7 @@
 
 #include "../core/tempdir.h"
 #include "../errortext.h"
+#include "../runtimescope.h"
 #include "testclasses.h"
 
 namespace {
@@ -35,12 +36,6 @@ OmbRef<T> publicObject(const OmbRef<OmbConfiguration>& c, const char* name) {
 std::string loadError(const std::string& body) {
     return errorOf([&] { load(body); });
 }
-
-class RuntimeScope : public ::testing::Test {
-protected:
-    void SetUp() override { OmbRuntime::init(); }
-    void TearDown() override { OmbRuntime::shutdown(); }
-};
 
 }  // namespace
 

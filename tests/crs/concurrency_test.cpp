@@ -11,15 +11,13 @@
 #include <vector>
 
 #include "../core/tempdir.h"
+#include "../runtimescope.h"
 #include "gridfiles.h"
 
 namespace {
 
-class SharedShifts : public ::testing::Test {
+class SharedShifts : public RuntimeScope {
 protected:
-    void SetUp() override { OmbRuntime::init(); }
-    void TearDown() override { OmbRuntime::shutdown(); }
-
     // Converts the same point on several threads at once, all starting
     // together so that their first calls race; counts results that differ
     // from the expected one.

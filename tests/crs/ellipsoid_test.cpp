@@ -12,15 +12,12 @@
 #include <string>
 #include <vector>
 
+#include "../runtimescope.h"
 #include "referencetool.h"
 
 namespace {
 
-class PredefinedObjects : public ::testing::Test {
-protected:
-    void SetUp() override { OmbRuntime::init(); }
-    void TearDown() override { OmbRuntime::shutdown(); }
-};
+class PredefinedObjects : public RuntimeScope {};
 
 struct Point {
     double lon, lat, h;

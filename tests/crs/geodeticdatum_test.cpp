@@ -13,15 +13,12 @@
 #include <vector>
 
 #include "../errortext.h"
+#include "../runtimescope.h"
 #include "referencetool.h"
 
 namespace {
 
-class Datums : public ::testing::Test {
-protected:
-    void SetUp() override { OmbRuntime::init(); }
-    void TearDown() override { OmbRuntime::shutdown(); }
-};
+class Datums : public RuntimeScope {};
 
 OmbRef<OmbGeodeticDatum> helmertDatum(const OmbRef<OmbEllipsoid>& ellipsoid, const OmbHelmertDatumShift::Parameters& p,
                                       const char* name = "D") {

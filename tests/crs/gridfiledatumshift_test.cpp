@@ -9,15 +9,13 @@
 
 #include "../core/tempdir.h"
 #include "../errortext.h"
+#include "../runtimescope.h"
 #include "gridfiles.h"
 
 namespace {
 
-class GridShifts : public ::testing::Test {
+class GridShifts : public RuntimeScope {
 protected:
-    void SetUp() override { OmbRuntime::init(); }
-    void TearDown() override { OmbRuntime::shutdown(); }
-
     void expectInterpolatesAndInverts(OmbGridFileDatumShift& shift) const;
 
     OmbRef<OmbGridFileDatumShift> shift(const std::string& pattern = "*.ct2") const {
