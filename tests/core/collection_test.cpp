@@ -61,13 +61,6 @@ TEST(Vec, IndicesOfChangesAreCheckedAndNothingChangesOnError) {
     EXPECT_THROW(empty->pop_back(), OmbXRangeError);
 }
 
-TEST(Vec, MemoryPressureFollowsCapacity) {
-    OmbRef<IntVec> v(new IntVec);
-    EXPECT_EQ(v->memoryPressure(), 4000u);
-    v->reserve(10);
-    EXPECT_EQ(v->memoryPressure(), 200u * v->capacity());
-}
-
 TEST(Vec, ReadOnlyIsEnforcedOnlyWithASharingPolicy) {
     OmbRef<SharedIntVec> shared(new SharedIntVec{1, 2});
     shared->markReadOnly();
