@@ -56,6 +56,11 @@
 #include <oecore/crs/geodesic.h>
 #include <oecore/crs/geodeticdatum.h>
 #include <oecore/crs/primemeridian.h>
+#include <oecore/crs/projection.h>
+#include <oecore/crs/projections/identity.h>
+#include <oecore/crs/projections/mercator.h>
+#include <oecore/crs/projections/transversemercator.h>
+#include <oecore/crs/units.h>
 
 #include <oecore/config/boxedvalue.h>
 #include <oecore/config/classdescription.h>

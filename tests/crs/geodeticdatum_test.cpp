@@ -8,7 +8,6 @@
 #include <cmath>
 #include <cstdio>
 #include <random>
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -36,23 +35,6 @@ OmbHelmertDatumShift::Parameters osgb() {
     p.rx = 0.15, p.ry = 0.247, p.rz = 0.842;
     p.scaleDifference = -20.489;
     return p;
-}
-
-// PROJ's cs2cs over "lon lat h" lines.
-std::vector<OmbPoint> cs2cs(const std::string& from, const std::string& to, const std::vector<OmbPoint>& points) {
-    std::vector<std::string> lines;
-    char line[128];
-    for (const OmbPoint& p : points) {
-        std::snprintf(line, sizeof line, "%.12f %.12f %.4f", p.x, p.y, p.z);
-        lines.push_back(line);
-    }
-    std::vector<OmbPoint> out;
-    for (const std::string& row : runReferenceTool("cs2cs -f %.12f " + from + " +to " + to, lines)) {
-        std::istringstream fields(row);
-        OmbPoint p;
-        if (fields >> p.x >> p.y >> p.z) out.push_back(p);
-    }
-    return out;
 }
 
 std::vector<OmbPoint> britishPoints() {

@@ -4,8 +4,12 @@
 
 #include <gtest/gtest.h>
 
+#include <oecore/linalg/point.h>
+
+#include <cstdio>
 #include <cstdlib>
 #include <fstream>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -25,4 +29,22 @@ inline std::vector<std::string> runReferenceTool(const std::string& command, con
     std::ifstream out(output);
     for (std::string line; std::getline(out, line);) result.push_back(line);
     return result;
+}
+
+// PROJ's cs2cs over "lon lat h" lines; its output is x y z.
+inline std::vector<OmbPoint> cs2cs(const std::string& from, const std::string& to,
+                                   const std::vector<OmbPoint>& points) {
+    std::vector<std::string> lines;
+    char line[128];
+    for (const OmbPoint& p : points) {
+        std::snprintf(line, sizeof line, "%.12f %.12f %.4f", p.x, p.y, p.z);
+        lines.push_back(line);
+    }
+    std::vector<OmbPoint> out;
+    for (const std::string& row : runReferenceTool("cs2cs -f %.12f " + from + " +to " + to, lines)) {
+        std::istringstream fields(row);
+        OmbPoint p;
+        if (fields >> p.x >> p.y >> p.z) out.push_back(p);
+    }
+    return out;
 }

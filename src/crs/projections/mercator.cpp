@@ -1,0 +1,196 @@
+// Mercator and Miller cylindrical.
+//
+// Mercator: Snyder, Map Projections - A Working Manual, USGS PP 1395,
+// eqs. 7-1, 7-2 (sphere), 7-6, 7-7 (ellipsoid), the inverse by the
+// iteration of eq. 7-9. The scale of a standard parallel by eq. 7-8 (its
+// spherical form, cos lat1). Miller: Snyder eqs. 11-1, 11-2 in the general
+// form y = y_Mercator(c lat) / c with Miller's c = 0.8.
+//
+// Exact within rounding; valid for the whole world: latitudes beyond
+// +-89.98 are compressed towards the pole so that the poles map to +-89.99
+// and y stays finite.
+#include "projectiondescriptions.h"
+
+#include <oecore/core/exception.h>
+#include <oecore/crs/projections/mercator.h>
+
+#include <cmath>
+
+OMB_DEFINE_ENGINE_CLASS(OmbMercator, OmbProjection, "MercatorProjection", 0)
+OMB_DEFINE_DESCRIBED_MEMBERS(OmbMercator)
+OMB_DEFINE_ENGINE_CLASS(OmbMiller, OmbMercator, "MillerCylindricalProjection", 0)
+OMB_DEFINE_DESCRIBED_MEMBERS(OmbMiller)
+
+OMB_DESCRIBE_CLASS(OmbMercator) {
+    using M = OmbMercator;
+    Omb_describeCentralLongitude(d);
+    Omb_describeFalseOrigin(d);
+    Omb_describeScaleFactor(d);
+    d.property<double>(
+        "StandardParallel", [](const M& p) { return p.standardParallel(); },
+        [](M& p, double v) { p.standardParallel(v); });
+    d.property<OmbEarthShape>(
+        "Shape", [](const M& p) { return p.shape(); }, [](M& p, OmbEarthShape v) { p.shape(v); },
+        OmbEarthShape::Sphere);
+    d.property<double>(
+        "SphereRadius", [](const M& p) { return p.sphereRadius(); }, [](M& p, double v) { p.sphereRadius(v); });
+    d.property<OmbString>(
+        "SphereRadiusSource", [](const M& p) { return p.sphereRadiusSource(); },
+        [](M& p, const OmbString& v) { p.sphereRadiusSource(v); });
+}
+
+OMB_DESCRIBE_CLASS(OmbMiller) {
+    d.property<double>(
+        "Compromise", [](const OmbMiller& p) { return p.compromise(); },
+        [](OmbMiller& p, double v) { p.compromise(v); }, 0.8);
+}
+
+namespace {
+
+constexpr double radiansPerDegree = 0.017453292519943295;
+constexpr double degreesPerRadian = 57.29577951308232;
+constexpr double poleCompressionStart = 89.98;
+
+class MercatorCachedNumbers : public OmbProjCachedNumbers {
+public:
+    MercatorCachedNumbers(const OmbGeodeticDatum& datum, const OmbMercator& m, double compromiseFactor)
+        : OmbProjCachedNumbers(datum, m.metersPerProjUnit()), compromise(compromiseFactor) {
+        ellipsoidal = m.shape() == OmbEarthShape::Ellipsoid && compromise == 1;
+        const double radius =
+            ellipsoidal ? a : sphereRadius(m.sphereRadiusSource(), m.sphereRadius(), m.standardParallel());
+        double k0 = m.scaleFactor();
+        if (m.standardParallel() != 0) {
+            const double lat1 = m.standardParallel() * radiansPerDegree;
+            const double s = std::sin(lat1);
+            k0 = std::cos(lat1) / (ellipsoidal ? std::sqrt(1 - e2 * s * s) : 1.0);
+        }
+        kx = ky = radius * k0 * radiansPerDegree * unitsPerMeter;
+        centralLongitude = m.centralLongitude();
+        falseEasting = m.falseEasting();
+        falseNorthing = m.falseNorthing();
+        groundPerUnit = metersPerUnit / k0;
+    }
+
+    bool ellipsoidal;
+    double compromise;
+    double kx, ky;  // projected units per degree
+    double centralLongitude, falseEasting, falseNorthing;
+    double groundPerUnit;
+};
+
+const MercatorCachedNumbers& numbers(const OmbProjCachedNumbers* cached) {
+    return *static_cast<const MercatorCachedNumbers*>(cached);
+}
+
+inline double moveAwayFromPole(double lat) {
+    const double away = std::fabs(lat) - poleCompressionStart;
+    return away > 0 ? std::copysign(poleCompressionStart + std::min(away / 2, 0.01), lat) : lat;
+}
+
+inline double moveTowardsPole(double lat) {
+    const double away = std::fabs(lat) - poleCompressionStart;
+    return away > 0 ? std::copysign(std::min(poleCompressionStart + 2 * away, 90.0), lat) : lat;
+}
+
+inline double wrapLongitude(double lon) {
+    if (lon >= -180 && lon <= 180) return lon;
+    lon -= std::floor((lon + 180) / 360) * 360;
+    return lon <= -180 ? lon + 360 : lon;
+}
+
+// The isometric latitude in radians.
+inline double isometric(const MercatorCachedNumbers& c, double lat) {
+    const double phi = lat * radiansPerDegree;
+    if (c.ellipsoidal) {
+        const double s = std::sin(phi);
+        return std::atanh(s) - c.e * std::atanh(c.e * s);
+    }
+    if (c.compromise <= 0.0001) return phi;
+    return std::atanh(std::sin(c.compromise * phi)) / c.compromise;
+}
+
+// Its inverse, in degrees.
+inline double latitudeOf(const MercatorCachedNumbers& c, double psi) {
+    if (!c.ellipsoidal) {
+        if (c.compromise <= 0.0001) return psi * degreesPerRadian;
+        return std::atan(std::sinh(c.compromise * psi)) / c.compromise * degreesPerRadian;
+    }
+    const double t = std::exp(-psi);
+    double phi = M_PI / 2 - 2 * std::atan(t);
+    for (int i = 0; i < 30; ++i) {
+        const double es = c.e * std::sin(phi);
+        const double next = M_PI / 2 - 2 * std::atan(t * std::pow((1 - es) / (1 + es), c.e / 2));
+        const bool settled = std::fabs(next - phi) <= 1e-12;
+        phi = next;
+        if (settled) break;
+    }
+    return phi * degreesPerRadian;
+}
+
+inline void forward(const MercatorCachedNumbers& c, OmbPoint& p) {
+    const double dLon = wrapLongitude(p.x - c.centralLongitude);
+    p.y = c.falseNorthing + isometric(c, moveAwayFromPole(p.y)) * degreesPerRadian * c.ky;
+    p.x = c.falseEasting + dLon * c.kx;
+}
+
+inline void inverse(const MercatorCachedNumbers& c, OmbPoint& p) {
+    p.x = wrapLongitude((p.x - c.falseEasting) / c.kx + c.centralLongitude);
+    p.y = moveTowardsPole(latitudeOf(c, (p.y - c.falseNorthing) / c.ky * radiansPerDegree));
+}
+
+}  // namespace
+
+OmbMercator::OmbMercator() : OmbProjection(true, false) {}
+
+void OmbMercator::standardParallel(double degrees) {
+    if (!(degrees >= -89 && degrees <= 89))
+        OMB_THROW(RangeError, "standardParallel", "MercatorProjection", "in [-89, 89]");
+    standardParallel_ = degrees;
+}
+
+OmbProjCachedNumbers* OmbMercator::init(const OmbGeodeticDatum& datum) const {
+    return new MercatorCachedNumbers(datum, *this, compromiseFactor());
+}
+
+void OmbMercator::project(OmbPointArray& points, const OmbProjCachedNumbers* cached) const {
+    const MercatorCachedNumbers& c = numbers(cached);
+    for (OmbPoint& p : points) forward(c, p);
+}
+
+void OmbMercator::project(OmbPoint& p, const OmbProjCachedNumbers* cached) const { forward(numbers(cached), p); }
+
+void OmbMercator::unproject(OmbPointArray& points, const OmbProjCachedNumbers* cached) const {
+    const MercatorCachedNumbers& c = numbers(cached);
+    for (OmbPoint& p : points) inverse(c, p);
+}
+
+void OmbMercator::unproject(OmbPoint& p, const OmbProjCachedNumbers* cached) const { inverse(numbers(cached), p); }
+
+void OmbMercator::nominalMetersXY(const OmbProjCachedNumbers* cached, double& mx, double& my) const {
+    mx = my = numbers(cached).groundPerUnit;
+}
+
+bool OmbMercator::equivalent(const OmbProjection& other) const {
+    if (!sameParameters(other)) return false;
+    const auto& m = static_cast<const OmbMercator&>(other);
+    return standardParallel_ == m.standardParallel_ && shape_ == m.shape_ && sphereRadius_ == m.sphereRadius_ &&
+           sphereRadiusSource_ == m.sphereRadiusSource_;
+}
+
+bool OmbMercator::compatibleWith(const OmbMercator& other, double worldWidth) const {
+    if (myRuntimeClass() != other.myRuntimeClass()) return false;
+    // The two worlds may start at different x, by whole world widths.
+    const double offset =
+        (other.falseEasting() - falseEasting()) - (other.centralLongitude() - centralLongitude()) * worldWidth / 360;
+    const double turns = offset / worldWidth;
+    return std::fabs(turns - std::round(turns)) * worldWidth <= 1e-5 &&
+           std::fabs(scaleFactor() - other.scaleFactor()) <= 1e-9 &&
+           std::fabs(standardParallel_ - other.standardParallel_) <= 1e-9 && falseNorthing() == other.falseNorthing() &&
+           shape_ == other.shape_ && sphereRadius_ == other.sphereRadius_ &&
+           sphereRadiusSource_ == other.sphereRadiusSource_ && compromiseFactor() == other.compromiseFactor() &&
+           lengthUnit()->equivalent(*other.lengthUnit());
+}
+
+bool OmbMiller::equivalent(const OmbProjection& other) const {
+    return OmbMercator::equivalent(other) && compromise_ == static_cast<const OmbMiller&>(other).compromise_;
+}
