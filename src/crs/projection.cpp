@@ -198,7 +198,8 @@ void OmbProjection::adjustRect(OmbRect& rect, const OmbProjCachedNumbers* cached
     project(quarter, cached);
     const double width = 4 * (quarter.x - centre.x);
     const double west = centre.x - width / 2;
-    rect.offset(-std::floor((rect.xmin - west) / width) * width, 0);
+    // A left edge on the world's edge, give or take rounding, stays there.
+    rect.offset(-std::floor((rect.xmin - west) / width + 1e-12) * width, 0);
 }
 
 OmbRect OmbProjection::getValidArea(const OmbProjCachedNumbers*) const { return {-180, -90, 180, 90}; }

@@ -1,0 +1,164 @@
+#include <oecore/core/exception.h>
+#include <oecore/crs/projections/identity.h>
+#include <oecore/crs/projections/mercator.h>
+#include <oecore/crs/projections/transversemercator.h>
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <sstream>
+
+#include "../errortext.h"
+#include "../runtimescope.h"
+#include "projectiontest.h"
+#include "referencetool.h"
+
+namespace {
+
+class Projections : public RuntimeScope {};
+
+// The bounds of the images of many points along the rectangle's edges.
+OmbRect denselySampledBounds(const OmbRect& r, const std::function<OmbPoint(OmbPoint)>& map) {
+    OmbRect bounds = OmbRect::invalid();
+    constexpr int steps = 20000;
+    for (int i = 0; i <= steps; ++i) {
+        const double t = double(i) / steps;
+        const double x = r.xmin + t * (r.xmax - r.xmin), y = r.ymin + t * (r.ymax - r.ymin);
+        for (const OmbPoint p : {OmbPoint(x, r.ymin), OmbPoint(x, r.ymax), OmbPoint(r.xmin, y), OmbPoint(r.xmax, y)})
+            bounds.include(map(p));
+    }
+    return bounds;
+}
+
+// The rectangle's image bounds cover the images of points inside it and are
+// no larger than the densely sampled edges' bounds (beyond tolerance).
+void expectTightCover(const OmbRect& in, const OmbRect& out, const std::function<OmbPoint(OmbPoint)>& map,
+                      double tolerance) {
+    for (const OmbPoint& p : randomPoints(7, 5000, in.xmin, in.xmax, in.ymin, in.ymax))
+        EXPECT_TRUE(out.inside(map(p))) << p.x << " " << p.y;
+    const OmbRect sampled = denselySampledBounds(in, map);
+    EXPECT_TRUE(out.extendCopy(tolerance, tolerance).covers(sampled));
+    EXPECT_TRUE(sampled.extendCopy(tolerance, tolerance).covers(out));
+}
+
+// GeographicLib's scale k and meridian convergence gamma for UTM zone 33.
+struct ScaleAndConvergence {
+    double k, gamma;
+};
+std::vector<ScaleAndConvergence> exactScales(const std::vector<OmbPoint>& points) {
+    std::vector<std::string> lines;
+    for (const OmbPoint& p : points) lines.push_back(std::to_string(p.y) + " " + std::to_string(p.x));
+    std::vector<ScaleAndConvergence> out;
+    for (const std::string& row : runReferenceTool("TransverseMercatorProj -p 9 -k 0.9996 -l 15", lines)) {
+        std::istringstream fields(row);
+        double x, y;
+        ScaleAndConvergence s;
+        if (fields >> x >> y >> s.gamma >> s.k) out.push_back(s);
+    }
+    return out;
+}
+
+}  // namespace
+
+TEST_F(Projections, ProjectedRectanglesAreTheTightBoundsOfTheirImages) {
+    for (const OmbRef<OmbProjection>& projection :
+         {OmbProjection::utm(33, OmbUTMHemisphere::North), OmbProjection::mercator1SPEllipsoid()}) {
+        const BoundProjection bound(projection);
+        // Across the equator and the central meridian, where the extremes
+        // of a parallel's image lie inside an edge.
+        const OmbRect lola(0, -20, 40, 60);
+        OmbRect projected;
+        ASSERT_TRUE(projection->project(lola, bound.cached.get(), projected));
+        expectTightCover(
+            lola, projected, [&](OmbPoint p) { return bound.project(p); }, 1e-6);
+        OmbRect back;
+        ASSERT_TRUE(projection->unproject(projected, bound.cached.get(), back));
+        expectTightCover(
+            projected, back, [&](OmbPoint p) { return bound.unproject(p); }, 1e-9);
+    }
+}
+
+TEST_F(Projections, MetresPerUnitAndDirectionsFollowTheScaleAndConvergence) {
+    const BoundProjection utm(OmbProjection::utm(33, OmbUTMHemisphere::North));
+    const auto points = randomPoints(9, 200, 9, 21, -70, 70);
+    const auto exact = exactScales(points);
+    ASSERT_EQ(exact.size(), points.size()) << "TransverseMercatorProj (geographiclib-tools) is needed";
+    for (std::size_t i = 0; i < points.size(); ++i) {
+        const OmbPoint p = utm.project(points[i]);
+        double mx, my;
+        ASSERT_TRUE(utm.projection->metersXY(p, utm.cached.get(), mx, my));
+        EXPECT_NEAR(mx * exact[i].k, 1, 1e-7);
+        EXPECT_NEAR(my * exact[i].k, 1, 1e-7);
+        // Grid north (90 degrees from the x axis) points gamma east of true
+        // north; true north is gamma left of grid north.
+        EXPECT_NEAR(utm.projection->azimuth(p, 90, utm.cached.get()), std::fmod(exact[i].gamma + 360, 360), 1e-6);
+        EXPECT_NEAR(utm.projection->angle(p, 0, utm.cached.get()), 90 + exact[i].gamma, 1e-6);
+    }
+    double nx, ny;
+    utm.projection->nominalMetersXY(utm.cached.get(), nx, ny);
+    EXPECT_DOUBLE_EQ(nx, 1 / 0.9996);
+}
+
+TEST_F(Projections, ValidityOfProjectedPoints) {
+    const BoundProjection mercator(OmbProjection::mercator1SPWeb());
+    EXPECT_TRUE(mercator.projection->isValidProjectedPoint({1e6, 1e6}, mercator.cached.get()));
+    // Beyond the image of the pole, and not a number.
+    EXPECT_FALSE(mercator.projection->isValidProjectedPoint({0, 1e9}, mercator.cached.get()));
+    EXPECT_FALSE(mercator.projection->isValidProjectedPoint({NAN, 0}, mercator.cached.get()));
+    double mx, my;
+    EXPECT_FALSE(mercator.projection->metersXY({0, 1e9}, mercator.cached.get(), mx, my));
+    EXPECT_EQ(mercator.projection->safePointForMetersXY({0, 1e9}, mercator.cached.get()),
+              mercator.projection->projectedOrigin(mercator.cached.get()));
+    const OmbPointArray perimeter = mercator.projection->worldPerimeter(mercator.cached.get());
+    ASSERT_GT(perimeter.size(), 4u);
+    EXPECT_EQ(perimeter.front(), perimeter.back());
+}
+
+TEST_F(Projections, ArraysProjectLikeTheirPoints) {
+    for (const OmbRef<OmbProjection>& projection :
+         {OmbProjection::utm(10, OmbUTMHemisphere::South), OmbProjection::miller1SP()}) {
+        const BoundProjection bound(projection);
+        OmbPointArray points;
+        for (const OmbPoint& p : randomPoints(11, 100, -180, 180, -80, 80)) points.push_back({p.x, p.y, 42});
+        OmbPointArray projected = points;
+        projection->project(projected, bound.cached.get());
+        for (std::size_t i = 0; i < points.size(); ++i) {
+            EXPECT_EQ(projected[i], bound.project(points[i]));
+            EXPECT_EQ(projected[i].z, 42);
+        }
+        projection->unproject(projected, bound.cached.get());
+        for (std::size_t i = 0; i < points.size(); ++i)
+            EXPECT_EQ(projected[i], bound.unproject(bound.project(points[i])));
+    }
+}
+
+TEST_F(Projections, PredefinedProjectionsAndUnits) {
+    const auto predefined = [](const char* name) {
+        return omb_dynamic_cast<OmbProjection>(OmbRuntime::getPredefinedObject(OmbString(name)));
+    };
+    const auto stockholm = predefined("Projections.TM2_5gonWStockholm");
+    ASSERT_TRUE(stockholm);
+    EXPECT_EQ(stockholm->authorityCode(), OmbString("19929"));
+    EXPECT_EQ(stockholm->falseEasting(), 1500000);
+    EXPECT_EQ(predefined("Projections.mercator1SP_web").get(), OmbProjection::mercator1SPWeb().get());
+    EXPECT_TRUE(predefined("Projections.TM_2_5gonW_SWEREF99"));
+    EXPECT_TRUE(predefined("Projections.mercatorMeter"));
+    // One degree is 60 nautical miles on the predefined spherical Mercator.
+    const BoundProjection meter(OmbProjection::mercator1SP());
+    EXPECT_NEAR(meter.project({1, 0}).x, 111120, 1e-6);
+
+    const auto screen = OmbProjection::screenProjection();
+    EXPECT_FALSE(screen->georeferenced());
+    EXPECT_EQ(screen->authority(), OmbString("ombravel"));
+    const auto longLat = OmbProjection::longLat();
+    EXPECT_TRUE(omb_dynamic_cast<OmbLoLa>(longLat));
+    EXPECT_EQ(errorOf([] { OmbLoLa(); }), "Can not create new LongLatProjection object, use predefined instance");
+
+    const auto foot = omb_dynamic_cast<OmbLengthUnit>(OmbRuntime::getPredefinedObject(OmbString("LengthUnits.Foot")));
+    ASSERT_TRUE(foot);
+    EXPECT_EQ(foot->name(), OmbString("foot"));
+    EXPECT_EQ(foot->inMeters(), 0.3048);
+    EXPECT_EQ(OmbLengthUnit::usSurveyFoot()->inMeters(), 1200.0 / 3937);
+    EXPECT_DOUBLE_EQ(OmbAngleUnit::gon()->toRadian(400), 2 * M_PI);
+    EXPECT_EQ(OmbRuntime::getPredefinedObject(OmbString("AngleUnits.Degree")).get(), OmbAngleUnit::degree().get());
+}
