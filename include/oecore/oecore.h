@@ -57,8 +57,13 @@
 #include <oecore/crs/geodeticdatum.h>
 #include <oecore/crs/primemeridian.h>
 #include <oecore/crs/projection.h>
+#include <oecore/crs/projections/azimuthal.h>
+#include <oecore/crs/projections/equidistantcylindrical.h>
 #include <oecore/crs/projections/identity.h>
+#include <oecore/crs/projections/lambertconformalconic.h>
 #include <oecore/crs/projections/mercator.h>
+#include <oecore/crs/projections/orthographic.h>
+#include <oecore/crs/projections/projlibprojections.h>
 #include <oecore/crs/projections/transversemercator.h>
 #include <oecore/crs/units.h>
 

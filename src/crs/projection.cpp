@@ -1,4 +1,5 @@
 #include "projections/edgesearch.h"
+#include "projections/projectionmath.h"
 
 #include <oecore/core/stringbuilder.h>
 #include <oecore/crs/projection.h>
@@ -12,8 +13,7 @@ OMB_DESCRIBE_CLASS(OmbProjection) { Omb_describeAuthority(d); }
 
 namespace {
 
-constexpr double radiansPerDegree = 0.017453292519943295;
-constexpr double degreesPerRadian = 57.29577951308232;
+using namespace OmbProjectionMath;
 
 bool finite(const OmbPoint& p) { return std::isfinite(p.x) && std::isfinite(p.y); }
 
@@ -106,8 +106,8 @@ bool OmbProjection::project(const OmbRect& in, const OmbProjCachedNumbers* cache
     // Extremes of x and y along a parallel lie at the central meridian or the
     // antimeridian, and the equator separates the hemispheres' behaviour.
     search.splitX(centralLongitude_);
-    search.splitX(normalizeLongitude(centralLongitude_ + 180));
-    search.splitX(normalizeLongitude(centralLongitude_ + 180) - 360);
+    search.splitX(wrapLongitude(centralLongitude_ + 180));
+    search.splitX(wrapLongitude(centralLongitude_ + 180) - 360);
     search.splitY(0);
     return search.bounds(in, out);
 }
@@ -151,7 +151,7 @@ bool OmbProjection::metersXYInternal(const OmbPoint& p, const OmbProjCachedNumbe
         const double s = std::sin(lat);
         const double north = (b.y - a.y) * radiansPerDegree * cached->meridianRadius(s);
         const double east =
-            normalizeLongitude(b.x - a.x) * radiansPerDegree * cached->primeVerticalRadius(s) * std::cos(lat);
+            wrapLongitude(b.x - a.x) * radiansPerDegree * cached->primeVerticalRadius(s) * std::cos(lat);
         return std::hypot(north, east) / std::hypot(dx, dy);
     };
     mx = groundPerUnit(1 / nominalX, 0);
@@ -186,7 +186,7 @@ double OmbProjection::azimuth(const OmbPoint& p, double angle, const OmbProjCach
     const double lat = (a.y + b.y) / 2 * radiansPerDegree;
     const double s = std::sin(lat);
     const double north = (b.y - a.y) * cached->meridianRadius(s);
-    const double east = normalizeLongitude(b.x - a.x) * cached->primeVerticalRadius(s) * std::cos(lat);
+    const double east = wrapLongitude(b.x - a.x) * cached->primeVerticalRadius(s) * std::cos(lat);
     const double az = std::atan2(east, north) * degreesPerRadian;
     return az < 0 ? az + 360 : az;
 }
@@ -259,7 +259,7 @@ OmbPoint OmbProjection::projectedOrigin(const OmbProjCachedNumbers* cached) cons
 }
 
 void OmbProjection::snapToWorld(OmbPoint& lola) const {
-    lola.x = normalizeLongitude(lola.x);
+    lola.x = wrapLongitude(lola.x);
     lola.y = std::clamp(lola.y, -90.0, 90.0);
 }
 
@@ -285,11 +285,4 @@ double OmbProjection::asinSafe(double x) const {
               "argument to asinSafe in map projection formula for " +
                   (name().empty() ? OmbString::literal(" (UNKNOWN PROJECTION)") : name()),
               value.str(), "in [-1, 1]");
-}
-
-double OmbProjection::normalizeLongitude(double degrees) {
-    if (degrees > -180 && degrees <= 180) return degrees;
-    double wrapped = degrees - std::floor((degrees + 180) / 360) * 360;
-    if (wrapped <= -180) wrapped += 360;
-    return wrapped;
 }

@@ -64,6 +64,10 @@ public:
 enum class OmbUTMHemisphere { North = 0, South = 1 };
 OMB_DESCRIBE_ENUM(OmbUTMHemisphere, "UTMHemisphere", {{"North", 0}, {"South", 1}})
 
+// Whether a method works on the datum's ellipsoid or on a sphere.
+enum class OmbEarthShape { Sphere = 0, Ellipsoid = 1 };
+OMB_DESCRIBE_ENUM(OmbEarthShape, "EarthShape", {{"Sphere", 0}, {"Ellipsoid", 1}})
+
 class OmbProjection : public OmbResourceObject {
     OMB_DECLARE_ENGINE_CLASS()
 
@@ -173,8 +177,6 @@ protected:
     // Arcsine for formula arguments that rounding may take just past +-1;
     // OmbXRangeError for arguments clearly outside.
     double asinSafe(double x) const;
-    // Degrees brought into (-180, 180].
-    static double normalizeLongitude(double degrees);
 
 private:
     bool cyclicX_;

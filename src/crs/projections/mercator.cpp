@@ -10,6 +10,7 @@
 // +-89.98 are compressed towards the pole so that the poles map to +-89.99
 // and y stays finite.
 #include "projectiondescriptions.h"
+#include "projectionmath.h"
 
 #include <oecore/core/exception.h>
 #include <oecore/crs/projections/mercator.h>
@@ -47,8 +48,8 @@ OMB_DESCRIBE_CLASS(OmbMiller) {
 
 namespace {
 
-constexpr double radiansPerDegree = 0.017453292519943295;
-constexpr double degreesPerRadian = 57.29577951308232;
+using namespace OmbProjectionMath;
+
 constexpr double poleCompressionStart = 89.98;
 
 class MercatorCachedNumbers : public OmbProjCachedNumbers {
@@ -92,11 +93,8 @@ inline double moveTowardsPole(double lat) {
     return away > 0 ? std::copysign(std::min(poleCompressionStart + 2 * away, 90.0), lat) : lat;
 }
 
-inline double wrapLongitude(double lon) {
-    if (lon >= -180 && lon <= 180) return lon;
-    lon -= std::floor((lon + 180) / 360) * 360;
-    return lon <= -180 ? lon + 360 : lon;
-}
+// Longitudes are wrapped only when outside [-180, 180], so -180 stays.
+inline double intoWorld(double lon) { return lon >= -180 && lon <= 180 ? lon : wrapLongitude(lon); }
 
 // The sine of an angle in [-pi/2, pi/2] by its Taylor series to the 21st
 // power (the remainder stays below 1e-17). Unlike the library's sin it needs
@@ -136,26 +134,19 @@ inline double latitudeOf(const MercatorCachedNumbers& c, double psi) {
         if (c.compromise <= 0.0001) return psi * degreesPerRadian;
         return std::atan(std::sinh(c.compromise * psi)) / c.compromise * degreesPerRadian;
     }
-    const double t = std::exp(-psi);
-    double phi = M_PI / 2 - 2 * std::atan(t);
-    for (int i = 0; i < 30; ++i) {
-        const double es = c.e * std::sin(phi);
-        const double next = M_PI / 2 - 2 * std::atan(t * std::pow((1 - es) / (1 + es), c.e / 2));
-        const bool settled = std::fabs(next - phi) <= 1e-12;
-        phi = next;
-        if (settled) break;
-    }
+    double phi;
+    latitudeFromIsometricExp(std::exp(-psi), c.e, phi);
     return phi * degreesPerRadian;
 }
 
 inline void forward(const MercatorCachedNumbers& c, OmbPoint& p) {
-    const double dLon = wrapLongitude(p.x - c.centralLongitude);
+    const double dLon = intoWorld(p.x - c.centralLongitude);
     p.y = c.falseNorthing + isometric(c, moveAwayFromPole(p.y)) * degreesPerRadian * c.ky;
     p.x = c.falseEasting + dLon * c.kx;
 }
 
 inline void inverse(const MercatorCachedNumbers& c, OmbPoint& p) {
-    p.x = wrapLongitude((p.x - c.falseEasting) / c.kx + c.centralLongitude);
+    p.x = intoWorld((p.x - c.falseEasting) / c.kx + c.centralLongitude);
     p.y = moveTowardsPole(latitudeOf(c, (p.y - c.falseNorthing) / c.ky * radiansPerDegree));
 }
 

@@ -1,7 +1,9 @@
 // The predefined projections ("Projections." + name) and the shared UTM
 // zones.
 #include <oecore/core/runtime.h>
+#include <oecore/crs/projections/azimuthal.h>
 #include <oecore/crs/projections/identity.h>
+#include <oecore/crs/projections/lambertconformalconic.h>
 #include <oecore/crs/projections/mercator.h>
 #include <oecore/crs/projections/transversemercator.h>
 
@@ -42,6 +44,15 @@ OmbMercator* sphericalMercator(const char* radiusSource, double radius = 0) {
     return m;
 }
 
+// Universal polar stereographic about either pole.
+OmbPolarStereographic* ups(bool north) {
+    auto* p = new OmbPolarStereographic(north);
+    p->scaleFactor(0.994);
+    p->falseEasting(2000000);
+    p->falseNorthing(2000000);
+    return p;
+}
+
 [[maybe_unused]] const bool registered =
     (OmbRuntime::registerPredefinedClass(OmbRuntime::PredefinedClass::Projections, OmbProjection::createPredefined,
                                          OmbProjection::destroyPredefined),
@@ -65,6 +76,9 @@ void OmbProjection::createPredefined() {
     miller->sphereRadiusSource(OmbString::literal("#radiusFromArgument"));
     miller->sphereRadius(nauticalMileSphereRadius);
     predefined.miller1SP = add(miller, "miller1SP");
+    add(ups(true), "UPS_North", "epsg", "16061");
+    add(ups(false), "UPS_South", "epsg", "16161");
+    add(new OmbLambertConformalConic2SP(10, 52, 35, 65, 4000000, 2800000), "EuropeConformal2001", "epsg", "19985");
 }
 
 void OmbProjection::destroyPredefined() {

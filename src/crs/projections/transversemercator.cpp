@@ -15,6 +15,8 @@
 //
 // Accuracy against the exact mapping: see the test suite, which compares
 // with GeographicLib's TransverseMercatorProj on random points.
+#include "projectionmath.h"
+
 #include <oecore/core/exception.h>
 #include <oecore/core/stringbuilder.h>
 #include <oecore/crs/projections/transversemercator.h>
@@ -44,8 +46,7 @@ OMB_DESCRIBE_CLASS(OmbUTM) {
 
 namespace {
 
-constexpr double radiansPerDegree = 0.017453292519943295;
-constexpr double degreesPerRadian = 57.29577951308232;
+using namespace OmbProjectionMath;
 
 // Conformal distances (atanh of the sine) from the central meridian where
 // the forward correction starts and ends fading, and beyond which the
@@ -118,12 +119,6 @@ inline double fadeWeight(double eta) {
     return std::clamp((fadeEnd - std::fabs(eta)) / (fadeEnd - fadeStart), 0.0, 1.0);
 }
 
-inline double wrapLongitude(double dLon) {
-    if (dLon > -180 && dLon <= 180) return dLon;
-    dLon -= std::floor((dLon + 180) / 360) * 360;
-    return dLon <= -180 ? dLon + 360 : dLon;
-}
-
 // Forward, in metres.
 inline void classicSeries(const TMCachedNumbers& c, double dLon, double lat, double& x, double& y) {
     const double phi = lat * radiansPerDegree;
@@ -177,20 +172,15 @@ inline bool inClassicZone(double dLon, double lat) {
 
 // The classic series parts from the exact mapping by up to a millimetre at
 // the edge of its zone, so the series inverse does not quite undo it: one
-// Newton step on the classic series (numeric Jacobian) does.
+// Newton step on the classic series does.
 inline void undoClassicSeries(const TMCachedNumbers& c, double x, double y, double& dLon, double& lat) {
     if (std::fabs(lat) > 89.9) return;
-    constexpr double h = 1e-6;
-    double x0, y0, xl, yl, xp, yp;
-    classicSeries(c, dLon, lat, x0, y0);
-    classicSeries(c, dLon + h, lat, xl, yl);
-    classicSeries(c, dLon, lat + h, xp, yp);
-    const double a = (xl - x0) / h, b = (xp - x0) / h, cc = (yl - y0) / h, d = (yp - y0) / h;
-    const double det = a * d - b * cc;
-    if (det == 0) return;
-    const double rx = x - x0, ry = y - y0;
-    dLon += (d * rx - b * ry) / det;
-    lat += (a * ry - cc * rx) / det;
+    newtonStep(
+        [&c](double lon, double la, double& px, double& py) {
+            classicSeries(c, lon, la, px, py);
+            return true;
+        },
+        x, y, dLon, lat);
 }
 
 inline void forward(const TMCachedNumbers& c, OmbPoint& p) {

@@ -6,10 +6,6 @@
 
 #include <oecore/crs/projection.h>
 
-// Whether a method works on the datum's ellipsoid or on a sphere.
-enum class OmbEarthShape { Sphere = 0, Ellipsoid = 1 };
-OMB_DESCRIBE_ENUM(OmbEarthShape, "EarthShape", {{"Sphere", 0}, {"Ellipsoid", 1}})
-
 class OmbMercator : public OmbProjection {
     OMB_DECLARE_ENGINE_CLASS()
     OMB_DESCRIBED_MEMBERS()

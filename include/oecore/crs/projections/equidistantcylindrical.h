@@ -1,0 +1,71 @@
+// Equidistant cylindrical (plate carree with a standard parallel): metric,
+// on the sphere or the ellipsoid, and angular, with x and y in an angle
+// unit. The world wraps around in x.
+//
+// Immutable once read; shared between threads.
+#pragma once
+
+#include <oecore/crs/projection.h>
+
+class OmbEquidistantCylindrical : public OmbProjection {
+    OMB_DECLARE_ENGINE_CLASS()
+    OMB_DESCRIBED_MEMBERS()
+
+public:
+    OmbEquidistantCylindrical() : OmbProjection(true, false) {}
+    OmbEquidistantCylindrical* clone() const override { return new OmbEquidistantCylindrical(*this); }
+
+    // The parallel of true scale in x.
+    double standardParallel() const noexcept { return standardParallel_; }
+    void standardParallel(double degrees) { standardParallel_ = degrees; }
+    OmbEarthShape shape() const noexcept { return shape_; }
+    void shape(OmbEarthShape shape) { shape_ = shape; }
+    double sphereRadius() const noexcept { return sphereRadius_; }
+    void sphereRadius(double metres) { sphereRadius_ = metres; }
+    const OmbString& sphereRadiusSource() const noexcept { return sphereRadiusSource_; }
+    void sphereRadiusSource(const OmbString& source) { sphereRadiusSource_ = source; }
+
+    using OmbProjection::project;
+    using OmbProjection::unproject;
+    OmbProjCachedNumbers* init(const OmbGeodeticDatum& datum) const override;
+    void project(OmbPoint& p, const OmbProjCachedNumbers* cached) const override;
+    void unproject(OmbPoint& p, const OmbProjCachedNumbers* cached) const override;
+    void nominalMetersXY(const OmbProjCachedNumbers* cached, double& mx, double& my) const override;
+    bool equivalent(const OmbProjection& other) const override;
+
+private:
+    double standardParallel_ = 0;
+    OmbEarthShape shape_ = OmbEarthShape::Ellipsoid;
+    double sphereRadius_ = 0;
+    OmbString sphereRadiusSource_;
+};
+
+class OmbEquidistantCylindricalAngularProjection : public OmbProjection {
+    OMB_DECLARE_ENGINE_CLASS()
+    OMB_DESCRIBED_MEMBERS()
+
+public:
+    OmbEquidistantCylindricalAngularProjection() : OmbProjection(true, false) {}
+    OmbEquidistantCylindricalAngularProjection* clone() const override {
+        return new OmbEquidistantCylindricalAngularProjection(*this);
+    }
+
+    // Degrees unless set ("AngleUnits.Degree").
+    const OmbRef<OmbAngleUnit>& angleUnit() const;
+    void angleUnit(const OmbRef<OmbAngleUnit>& unit) { angleUnit_ = unit; }
+    const OmbRef<OmbAngleUnit>& configuredAngleUnit() const noexcept { return angleUnit_; }
+    double standardParallel() const noexcept { return standardParallel_; }
+    void standardParallel(double degrees) { standardParallel_ = degrees; }
+
+    using OmbProjection::project;
+    using OmbProjection::unproject;
+    void project(OmbPoint& p, const OmbProjCachedNumbers* cached) const override;
+    void unproject(OmbPoint& p, const OmbProjCachedNumbers* cached) const override;
+    // Metres per angle unit along the equator.
+    void nominalMetersXY(const OmbProjCachedNumbers* cached, double& mx, double& my) const override;
+    bool equivalent(const OmbProjection& other) const override;
+
+private:
+    OmbRef<OmbAngleUnit> angleUnit_;
+    double standardParallel_ = 0;
+};
