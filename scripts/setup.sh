@@ -11,6 +11,7 @@ packages=(
   googletest libgtest-dev libbenchmark-dev
   clang libfuzzer-14-dev libclang-rt-14-dev
   geographiclib-tools proj-bin libproj-dev
+  libnewmat10-dev
 )
 
 missing=()

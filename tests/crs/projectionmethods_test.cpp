@@ -4,9 +4,11 @@
 #include <oecore/core/exception.h>
 #include <oecore/crs/projections/azimuthal.h>
 #include <oecore/crs/projections/equidistantcylindrical.h>
+#include <oecore/crs/projections/krovak.h>
 #include <oecore/crs/projections/lambertconformalconic.h>
 #include <oecore/crs/projections/orthographic.h>
 #include <oecore/crs/projections/projlibprojections.h>
+#include <oecore/crs/projections/rosenmund.h>
 
 #include <gtest/gtest.h>
 
@@ -127,6 +129,24 @@ std::vector<Method> methods() {
          "+proj=eqc +lat_ts=30 +lat_0=5 +lon_0=10 +R=6378137",
          {-170, -89, 190, 89},
          1e-5},
+        {"Krovak",
+         [] { return OmbRef<OmbProjection>(new OmbKrovak); },
+         "+proj=krovak +lat_0=49.5 +lon_0=24.83333333333333 +alpha=30.28813975277778 +k=0.9999",
+         {12, 47.5, 23, 51.5},
+         1e-5,
+         "bessel"},
+        {"Rosenmund oblique Mercator",
+         [] {
+             return made<OmbRosenmundObliqueMercator>(
+                 new OmbRosenmundObliqueMercator, [](OmbRosenmundObliqueMercator& p) {
+                     p.centralLatitude(46.95240555555556), p.centralLongitude(7.439583333333333);
+                     p.falseEasting(600000), p.falseNorthing(200000);
+                 });
+         },
+         "+proj=somerc +lat_0=46.95240555555556 +lon_0=7.439583333333333 +x_0=600000 +y_0=200000",
+         {0, 40, 15, 55},
+         1e-5,
+         "bessel"},
         {"Albers equal area conic",
          [] {
              return made<OmbAlbersEqualAreaConic>(new OmbAlbersEqualAreaConic, [](OmbAlbersEqualAreaConic& p) {
@@ -216,4 +236,68 @@ TEST_F(ProjectionMethods, AgreeWithProjAndReturnEveryPoint) {
         EXPECT_LT(worst, m.tolerance);
         EXPECT_LT(bound.worstRoundTrip(points), 1e-9);
     }
+}
+
+TEST_F(ProjectionMethods, ParameterErrorsNameTheParameterAndTheRange) {
+    const auto initOn = [](OmbProjection* projection) {
+        const OmbRef<OmbProjection> keep(projection);
+        delete projection->init(*OmbGeodeticDatum::wgs84());
+    };
+    EXPECT_EQ(errorOf([] { OmbLambertConformalConic2SP(0, 0, 89.9995, 89.9995); }),
+              "Value \"the single standard parallel\" is out of range in LambertConformalConicProjection, should be "
+              "between -89.999 and -0.001 or between +0.001 and +89.999; did you want a PolarStereographic or a "
+              "Stereographic projection?.");
+    EXPECT_EQ(errorOf([] { OmbLambertConformalConic2SP(0, 0, 30, -30); }),
+              "Value \"average of standardParallel1 and standardParallel2\" is out of range in "
+              "LambertConformalConicProjection, should be between -89.999 and -0.001 or between +0.001 and +89.999; "
+              "did you want a Mercator projection?.");
+    auto* both = new OmbPolarStereographic(true);
+    both->name(OmbString("ps"));
+    both->scaleFactor(0.994);
+    both->standardParallel(71);
+    EXPECT_EQ(errorOf([&] { initOn(both); }),
+              "in ps, at least one of scaleFactor and standardParallel must have its default value or be unspecified.");
+    auto* wrongSide = new OmbPolarStereographic(false);
+    wrongSide->standardParallel(71);
+    EXPECT_EQ(errorOf([&] { initOn(wrongSide); }),
+              "Value \"standardParallel\" is out of range in PolarStereographicProjection, should be same hemisphere "
+              "as central pole.");
+    EXPECT_EQ(errorOf([] { OmbAzimuthalEquidistant().set(200, 0); }),
+              "centralLongitude must be in the interval [-180,180] and centralLatitude must be in the interval "
+              "[-90,90].");
+
+    const BoundProjection orthographic(OmbRef<OmbProjection>(new OmbOrthographic(0, 0)));
+    EXPECT_EQ(
+        errorOf([&] {
+            orthographic.project({120, 0});
+        }),
+        "Projection error in OrthographicProjection, point (120, 0): the point lies on the far side of the earth");
+    EXPECT_EQ(errorOf([&] {
+                  orthographic.unproject({7e6, 0});
+              }),
+              "Projection error in OrthographicProjection, point (7000000, 0): the point lies outside the projected "
+              "earth");
+    EXPECT_FALSE(orthographic.projection->isValid({120, 0}, orthographic.cached.get()));
+    EXPECT_TRUE(orthographic.projection->isValid({80, 0}, orthographic.cached.get()));
+}
+
+TEST_F(ProjectionMethods, EllipsoidalEquidistantCylindricalMeasuresAlongTheMeridian) {
+    auto* eqc = new OmbEquidistantCylindrical;
+    eqc->centralLatitude(10);
+    eqc->standardParallel(45);
+    const BoundProjection bound{OmbRef<OmbProjection>(eqc)};
+    std::vector<std::string> lines;
+    const std::vector<double> latitudes{-80, -35.5, 0, 10, 44.4, 89};
+    for (double lat : latitudes) lines.push_back("10 0 " + std::to_string(lat) + " 0");
+    const auto distances = runReferenceTool("GeodSolve -i -p 6", lines);
+    ASSERT_EQ(distances.size(), latitudes.size()) << "GeodSolve (geographiclib-tools) is needed";
+    for (std::size_t i = 0; i < latitudes.size(); ++i) {
+        const double metres = std::stod(distances[i].substr(distances[i].rfind(' ')));
+        EXPECT_NEAR(std::fabs(bound.project({0, latitudes[i]}).y), metres, 1e-4) << latitudes[i];
+    }
+    // Along the standard parallel x is the parallel's own length.
+    const double parallel = OmbEllipsoid::wgs84()->equatorialRadius() * std::cos(45 * M_PI / 180) /
+                            std::sqrt(1 - OmbEllipsoid::wgs84()->e2() * 0.5);
+    EXPECT_NEAR(bound.project({1, 0}).x, parallel * M_PI / 180, 1e-6);
+    EXPECT_LT(bound.worstRoundTrip(randomPoints(3, 1000, -180, 180, -90, 90)), 1e-9);
 }
