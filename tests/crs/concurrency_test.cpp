@@ -1,12 +1,15 @@
-// Datums and shifts shared by threads: the caches that shifts build on first
-// use are built once, and every thread sees the same results.
+// Datums, shifts and projections shared by threads: the caches that shifts
+// build on first use are built once, and every thread sees the same results.
 #include <oecore/core/runtime.h>
 #include <oecore/crs/geodeticdatum.h>
+#include <oecore/crs/projections/dynamiclocal.h>
+#include <oecore/crs/projections/projlibprojections.h>
 
 #include <gtest/gtest.h>
 
 #include <atomic>
 #include <functional>
+#include <memory>
 #include <thread>
 #include <vector>
 
@@ -16,7 +19,7 @@
 
 namespace {
 
-class SharedShifts : public RuntimeScope {
+class SharedByThreads : public RuntimeScope {
 protected:
     // Converts the same point on several threads at once, all starting
     // together so that their first calls race; counts results that differ
@@ -37,7 +40,7 @@ protected:
     }
 };
 
-TEST_F(SharedShifts, HelmertMatricesAreBuiltOnceForAllThreads) {
+TEST_F(SharedByThreads, HelmertMatricesAreBuiltOnceForAllThreads) {
     const auto datum = [] {
         OmbHelmertDatumShift::Parameters p;
         p.dx = 446.448, p.dy = -125.157, p.dz = 542.06, p.rx = 0.15, p.ry = 0.247, p.rz = 0.842;
@@ -61,7 +64,7 @@ TEST_F(SharedShifts, HelmertMatricesAreBuiltOnceForAllThreads) {
               0);
 }
 
-TEST_F(SharedShifts, GridFilesAreOpenedOnceForAllThreads) {
+TEST_F(SharedByThreads, GridFilesAreOpenedOnceForAllThreads) {
     const TempDir dir;
     dir.write("a.ct2", ctable2([](int lon, int lat) { return std::pair(0.5 * lon, 0.25 * lat); }));
     const auto shift = [&] {
@@ -82,6 +85,56 @@ TEST_F(SharedShifts, GridFilesAreOpenedOnceForAllThreads) {
                   },
                   expected),
               0);
+}
+
+TEST_F(SharedByThreads, ProjectionsEvaluatedByProjServeSeveralThreads) {
+    OmbRef<OmbAlbersEqualAreaConic> albers(new OmbAlbersEqualAreaConic);
+    albers->standardParallel1(29.5);
+    albers->standardParallel2(45.5);
+    const std::unique_ptr<OmbProjCachedNumbers> cached(albers->init(*OmbGeodeticDatum::wgs84()));
+    OmbPoint expected(-100, 40);
+    albers->project(expected, cached.get());
+    EXPECT_EQ(differingResults(
+                  [&] {
+                      OmbPoint p(-100, 40);
+                      albers->project(p, cached.get());
+                      return p;
+                  },
+                  expected),
+              0);
+}
+
+// The centre moves while other threads project: each result belongs to one
+// whole state, never to a mix of two.
+TEST_F(SharedByThreads, DynamicLocalProjectionMovesWhileInUse) {
+    OmbRef<OmbDynamicLocalProjection> local(new OmbDynamicLocalProjection);
+    const std::unique_ptr<OmbProjCachedNumbers> cached(local->init(*OmbGeodeticDatum::wgs84()));
+    const auto projected = [&] {
+        OmbPoint p(10.5, 60.5);
+        local->project(p, cached.get());
+        return p;
+    };
+    local->set(10, 60, 30);
+    const OmbPoint first = projected();
+    local->set(11, 61, -45);
+    const OmbPoint second = projected();
+    std::atomic<bool> done{false};
+    std::atomic<int> mixed{0};
+    std::thread mover([&] {
+        for (int i = 0; i < 2000; ++i) local->set(i % 2 ? 10 : 11, i % 2 ? 60 : 61, i % 2 ? 30 : -45);
+        done = true;
+    });
+    std::vector<std::thread> readers;
+    for (int t = 0; t < 3; ++t)
+        readers.emplace_back([&] {
+            while (!done) {
+                const OmbPoint p = projected();
+                if (!(p == first) && !(p == second)) ++mixed;
+            }
+        });
+    mover.join();
+    for (std::thread& t : readers) t.join();
+    EXPECT_EQ(mixed, 0);
 }
 
 }  // namespace

@@ -1,3 +1,4 @@
+#include <oecore/config/configuration.h>
 #include <oecore/core/exception.h>
 #include <oecore/crs/projections/identity.h>
 #include <oecore/crs/projections/mercator.h>
@@ -161,4 +162,62 @@ TEST_F(Projections, PredefinedProjectionsAndUnits) {
     EXPECT_EQ(OmbLengthUnit::usSurveyFoot()->inMeters(), 1200.0 / 3937);
     EXPECT_DOUBLE_EQ(OmbAngleUnit::gon()->toRadian(400), 2 * M_PI);
     EXPECT_EQ(OmbRuntime::getPredefinedObject(OmbString("AngleUnits.Degree")).get(), OmbAngleUnit::degree().get());
+}
+
+TEST_F(Projections, EveryClassReadsItsConfigurationAndSavesItAgain) {
+    const char* text = R"(<?xml version="1.0" encoding="utf-8"?>
+<Configuration Namespace="P">
+  <TransverseMercatorProjection Name="tm" Public="true" CentralLongitude="9" ScaleFactor="0.9996" FalseEasting="32500000"/>
+  <UtmProjection Name="utm" Public="true" Zone="33" Hemisphere="South"/>
+  <MercatorProjection Name="merc" Public="true" StandardParallel="41" Shape="Ellipsoid"/>
+  <MillerCylindricalProjection Name="mill" Public="true" Compromise="0.7"/>
+  <EquidistantCylindricalProjection Name="eqc" Public="true" StandardParallel="30" Shape="Sphere"
+      SphereRadiusSource="#equalArea"/>
+  <EquidistantCylindricalAngularProjection Name="eqa" Public="true" StandardParallel="30"
+      AngleUnit="{ResourceReference Predefined=true, Value=AngleUnits.Gon}"/>
+  <LambertConformalConicProjection Name="lcc" Public="true" CentralLatitude="46.5" CentralLongitude="3"
+      StandardParallel1="44" StandardParallel2="49" FalseEasting="700000" FalseNorthing="6600000"/>
+  <AlbersEqualAreaConicProjection Name="aea" Public="true" StandardParallel1="29.5" StandardParallel2="45.5"/>
+  <StereographicProjection Name="stere" Public="true" CentralLatitude="52" CentralLongitude="5" Variant="International"/>
+  <PolarStereographicProjection Name="ps" Public="true" NorthPole="false" StandardParallel="-71"/>
+  <OrthographicProjection Name="ortho" Public="true" CentralLatitude="40" CentralLongitude="-100"/>
+  <AzimuthalEqualAreaProjection Name="laea" Public="true" CentralLatitude="52" CentralLongitude="10" Purpose="Storage"/>
+  <AzimuthalEquidistantProjection Name="aeqd" Public="true" CentralLatitude="-20" Shape="Sphere"/>
+  <CassiniSoldnerProjection Name="cass" Public="true" CentralLatitude="10.4" CentralLongitude="-61.3"/>
+  <HotineObliqueMercatorProjection Name="omerc" Public="true" CentralLatitude="4" CentralLongitude="115"
+      Azimuth="53.3" RectifiedGridAngle="53.1" ScaleFactor="0.99984" TrueOrigin="HotineNaturalOriginNearEquator"/>
+  <LabordeObliqueMercatorProjection Name="labrd" Public="true" CentralLatitude="-18.9" CentralLongitude="46.4"
+      Azimuth="18.9" ScaleFactor="0.9995"/>
+  <RosenmundObliqueMercatorProjection Name="rom" Public="true" CentralLatitude="46.95" CentralLongitude="7.44"/>
+  <KrovakNorthOrientedProjection Name="krovak" Public="true" FalseEasting="5"/>
+  <NewZealandMapGridProjection Name="nzmg" Public="true"/>
+  <NonGeoreferencedProjection Name="plane" Public="true" LengthUnit="{ResourceReference Predefined=true, Value=LengthUnits.Foot}"/>
+  <DynamicLocalProjection Name="local" Public="true" CentralLatitude="60" CentralLongitude="10" Up="30"/>
+  <PolynomialProjection Name="poly" Public="true" GeoreferencedPoints="10 50; 12 50; 10 51; 12 51"
+      ImagePoints="0 800; 1000 800; 0 0; 1000 0"/>
+  <RotatedProjection Name="rot" Public="true" Up="15" BaseProjection="{ResourceReference Value=tm}"/>
+</Configuration>)";
+    const auto config = OmbXmlParser::loadString(OmbString(text), {}, OmbDataSetInitialization::Delayed, {});
+    const auto names = config->publicNames();
+    ASSERT_EQ(names->size(), 23u);
+    for (const OmbString& name : *names) {
+        SCOPED_TRACE(std::string(name));
+        const auto projection = omb_dynamic_cast<OmbProjection>(config->getPublicObject(name));
+        ASSERT_TRUE(projection);
+        const auto again = OmbXmlParser::loadString(projection->save(), {}, OmbDataSetInitialization::Delayed, {});
+        const auto reread = omb_dynamic_cast<OmbProjection>(again->getPublicObject(projection->name()));
+        ASSERT_TRUE(reread);
+        EXPECT_TRUE(reread->equivalent(*projection));
+        EXPECT_EQ(reread->myRuntimeClass(), projection->myRuntimeClass());
+        // Every one projects a point of its own area and returns it: near
+        // its centre, or where its fixed grid or control points lie.
+        const BoundProjection bound(reread);
+        const std::string local(projection->name());
+        const OmbPoint inArea = local == "nzmg"   ? OmbPoint(174, -41)
+                                : local == "poly" ? OmbPoint(11, 50.5)
+                                : local == "ps"
+                                    ? OmbPoint(0, -80)
+                                    : OmbPoint(reread->centralLongitude() + 0.1, reread->centralLatitude() + 0.1);
+        EXPECT_TRUE(bound.unproject(bound.project(inArea)).approxEqual(inArea, 1e-9));
+    }
 }
