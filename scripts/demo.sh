@@ -13,3 +13,5 @@ echo
 "$omb" expr 'kind = #berth and depth >= 9.5' kind=#berth depth=11.2
 echo
 "$omb" datum "$root/data/demo/harbour.px" OSGB36 Datums.Wgs84 -2,53,100 -0.1276,51.5072
+echo
+"$omb" project "$root/data/demo/harbour.px" BritishNationalGrid OSGB36 1.717921583,52.657570306 -0.1276,51.5072

@@ -59,7 +59,7 @@ expect("expr;class = = 2" 1 "Unexpected token\n  class = = 2\n          \\^")
 expect("expr;a;a=harbour" 2 "'a=harbour' is not NAME=VALUE with a literal value")
 
 # The bundled demo loads.
-expect("info;${DEMO}" 0 "Harbour.OSGB36  GeodeticDatum\n3 public objects")
+expect("info;${DEMO}" 0 "Harbour.OSGB36  GeodeticDatum\n4 public objects")
 
 # Datum changes between a datum of the demo and the predefined WGS 84.
 expect("datum;${DEMO};OSGB36;Datums.Wgs84;-2,53,100;1.5,51.2" 0
@@ -68,3 +68,13 @@ expect("datum;${DEMO};Datums.Wgs84;OSGB36;-2.001448828,53.000308016,149.8475" 0 
 expect("datum;${DEMO};OSGB36;Nowhere;1,2" 1 "no geodetic datum named 'Nowhere'")
 expect("datum;${DEMO};OSGB36;Datums.Wgs84;1,x" 2 "'1,x' is not LON,LAT or LON,LAT,H")
 expect("datum;${DEMO};OSGB36" 2 "datum takes FILE.px FROM TO")
+
+# Projections of the demo, predefined ones and UTM zones, both ways; the
+# first point is the Ordnance Survey's worked example.
+expect("project;${DEMO};BritishNationalGrid;OSGB36;1.717921583,52.657570306" 0 "^651409\\.90[0-9]+ 313177\\.27[0-9]+")
+expect("unproject;${DEMO};BritishNationalGrid;OSGB36;651409.903,313177.270" 0 "^1\\.7179215[0-9]+ 52\\.6575703[0-9]+")
+expect("project;${DEMO};Utm33S;Datums.Wgs84;15,0" 0 "^500000\\.0000 10000000\\.0000")
+expect("project;${DEMO};Projections.mercator1SP_web;Datums.Wgs84;180,0" 0 "^20037508\\.3428 0\\.0000")
+expect("project;${DEMO};Utm61N;Datums.Wgs84;1,2" 1 "no projection named 'Utm61N'")
+expect("project;${DEMO};BritishNationalGrid;OSGB36;1" 2 "'1' is not LON,LAT or LON,LAT,H")
+expect("unproject;${DEMO};BritishNationalGrid" 2 "unproject takes FILE.px PROJECTION DATUM and at least one X,Y")

@@ -58,8 +58,8 @@
 #include <oecore/crs/primemeridian.h>
 #include <oecore/crs/projection.h>
 #include <oecore/crs/projections/azimuthal.h>
-#include <oecore/crs/projections/equidistantcylindrical.h>
 #include <oecore/crs/projections/dynamiclocal.h>
+#include <oecore/crs/projections/equidistantcylindrical.h>
 #include <oecore/crs/projections/identity.h>
 #include <oecore/crs/projections/krovak.h>
 #include <oecore/crs/projections/lambertconformalconic.h>
@@ -68,8 +68,8 @@
 #include <oecore/crs/projections/polynomial.h>
 #include <oecore/crs/projections/projlibprojections.h>
 #include <oecore/crs/projections/rosenmund.h>
-#include <oecore/crs/projections/wrappedprojections.h>
 #include <oecore/crs/projections/transversemercator.h>
+#include <oecore/crs/projections/wrappedprojections.h>
 #include <oecore/crs/units.h>
 
 #include <oecore/config/boxedvalue.h>

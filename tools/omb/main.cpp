@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <iostream>
+#include <memory>
 #include <string>
 #include <utility>
 #include <vector>
@@ -26,6 +27,12 @@ void printHelp(std::ostream& out) {
            "  datum FILE.px FROM TO LON,LAT[,H]...\n"
            "                         move points (degrees, height in metres) from one geodetic datum\n"
            "                         to another; datums by public name or predefined (Datums.Wgs84)\n"
+           "  project FILE.px PROJECTION DATUM LON,LAT[,H]...\n"
+           "                         project points (degrees) on a datum's ellipsoid to x, y in the\n"
+           "                         projection's unit; projections by public name or predefined\n"
+           "                         (Projections.mercator1SP_web), or UTM zones as Utm33N, Utm33S\n"
+           "  unproject FILE.px PROJECTION DATUM X,Y[,Z]...\n"
+           "                         the reverse: projected points back to degrees\n"
            "\n"
            "Options:\n"
            "  --param KEY=VALUE  a configuration parameter for ConfigurationParameter (repeatable)\n"
@@ -177,14 +184,27 @@ int evaluateExpression(const Options& options) {
     return 0;
 }
 
-// A datum by its public name in the configuration or by its predefined name.
-OmbRef<OmbGeodeticDatum> findDatum(const OmbConfiguration& configuration, const std::string& name) {
+// An object of class T by its public name in the configuration or by its
+// predefined name.
+template <class T>
+OmbRef<T> findNamed(const OmbConfiguration& configuration, const std::string& name) {
     OmbRef<OmbEngineObject> object = configuration.getPublicObject(OmbString(name));
     if (!object) object = OmbRuntime::getPredefinedObject(OmbString(name));
-    return omb_dynamic_cast<OmbGeodeticDatum>(object);
+    return omb_dynamic_cast<T>(object);
 }
 
-// "lon,lat" or "lon,lat,h", all numbers.
+// A projection by name, or a UTM zone written as Utm33N or Utm33S.
+OmbRef<OmbProjection> findProjection(const OmbConfiguration& configuration, const std::string& name) {
+    if (OmbRef<OmbProjection> named = findNamed<OmbProjection>(configuration, name)) return named;
+    int zone = 0;
+    char hemisphere = 0, rest = 0;
+    if (std::sscanf(name.c_str(), "Utm%d%c%c", &zone, &hemisphere, &rest) == 2 && zone >= 1 && zone <= 60 &&
+        (hemisphere == 'N' || hemisphere == 'S'))
+        return OmbProjection::utm(zone, hemisphere == 'N' ? OmbUTMHemisphere::North : OmbUTMHemisphere::South);
+    return {};
+}
+
+// "x,y" or "x,y,z", all numbers.
 bool parsePoint(const std::string& text, OmbPoint& p) {
     const char* at = text.c_str();
     for (std::size_t i = 0; i < 3; ++i) {
@@ -198,41 +218,85 @@ bool parsePoint(const std::string& text, OmbPoint& p) {
     return false;
 }
 
+// The points from the command's arguments at first and after; false, with
+// a message, when one is not a point.
+bool readPoints(const Options& options, std::size_t first, const char* form, OmbPointArray& points) {
+    for (std::size_t i = first; i < options.files.size(); ++i) {
+        OmbPoint p;
+        if (!parsePoint(options.files[i], p)) {
+            std::cerr << "omb: '" << options.files[i] << "' is not " << form << "\n";
+            return false;
+        }
+        points.push_back(p);
+    }
+    return true;
+}
+
+// One line a point, x and y with the given number of decimals.
+void printPoints(const OmbPointArray& points, int decimals) {
+    char line[128];
+    for (const OmbPoint& p : points) {
+        std::snprintf(line, sizeof line, "%.*f %.*f %.4f\n", decimals, p.x, decimals, p.y, p.z);
+        std::cout << line;
+    }
+}
+
 int convertDatum(const Options& options) {
     if (options.files.size() < 4) {
         std::cerr << "omb: datum takes FILE.px FROM TO and at least one LON,LAT[,H]; see 'omb --help'\n";
         return 2;
     }
     OmbPointArray points;
-    for (std::size_t i = 3; i < options.files.size(); ++i) {
-        OmbPoint p;
-        if (!parsePoint(options.files[i], p)) {
-            std::cerr << "omb: '" << options.files[i] << "' is not LON,LAT or LON,LAT,H\n";
-            return 2;
-        }
-        points.push_back(p);
-    }
+    if (!readPoints(options, 3, "LON,LAT or LON,LAT,H", points)) return 2;
     const OmbRef<OmbConfiguration> configuration = loadConfiguration(options);
     OmbRef<OmbGeodeticDatum> datums[2];
     for (int i = 0; i < 2; ++i) {
-        datums[i] = findDatum(*configuration, options.files[1 + i]);
+        datums[i] = findNamed<OmbGeodeticDatum>(*configuration, options.files[1 + i]);
         if (!datums[i]) {
             std::cerr << "omb: " << options.files[0] << ": no geodetic datum named '" << options.files[1 + i] << "'\n";
             return 1;
         }
     }
     datums[0]->changeDatumTo(*datums[1], points);
-    char line[96];
-    for (const OmbPoint& p : std::as_const(points)) {
-        std::snprintf(line, sizeof line, "%.9f %.9f %.4f\n", p.x, p.y, p.z);
-        std::cout << line;
+    printPoints(points, 9);
+    return 0;
+}
+
+// project and unproject.
+int projectPoints(const Options& options, bool inverse) {
+    const char* form = inverse ? "X,Y or X,Y,Z" : "LON,LAT or LON,LAT,H";
+    if (options.files.size() < 4) {
+        std::cerr << "omb: " << options.command << " takes FILE.px PROJECTION DATUM and at least one " << form
+                  << "; see 'omb --help'\n";
+        return 2;
     }
+    OmbPointArray points;
+    if (!readPoints(options, 3, form, points)) return 2;
+    const OmbRef<OmbConfiguration> configuration = loadConfiguration(options);
+    const OmbRef<OmbProjection> projection = findProjection(*configuration, options.files[1]);
+    if (!projection) {
+        std::cerr << "omb: " << options.files[0] << ": no projection named '" << options.files[1] << "'\n";
+        return 1;
+    }
+    const OmbRef<OmbGeodeticDatum> datum = findNamed<OmbGeodeticDatum>(*configuration, options.files[2]);
+    if (!datum) {
+        std::cerr << "omb: " << options.files[0] << ": no geodetic datum named '" << options.files[2] << "'\n";
+        return 1;
+    }
+    const std::unique_ptr<OmbProjCachedNumbers> cached(projection->init(*datum));
+    if (inverse)
+        projection->unproject(points, cached.get());
+    else
+        projection->project(points, cached.get());
+    printPoints(points, inverse ? 9 : 4);
     return 0;
 }
 
 int run(const Options& options) {
     if (options.command == "expr") return evaluateExpression(options);
     if (options.command == "datum") return convertDatum(options);
+    if (options.command == "project" || options.command == "unproject")
+        return projectPoints(options, options.command == "unproject");
     if (options.command == "info" && options.files.empty()) {
         std::cout << "OECore " << OmbRuntime::version() << "\n";
         printClasses(std::cout);
