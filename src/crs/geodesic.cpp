@@ -3,6 +3,7 @@
 // 88-93 (equations 1-6 and 10-18 as numbered there). Accurate to about
 // 0.1 mm away from nearly antipodal points, where the inverse iteration
 // need not converge.
+#include <oecore/core/exception.h>
 #include <oecore/crs/geodesic.h>
 
 #include <algorithm>
@@ -210,4 +211,58 @@ OmbPoint Omb_pointPlusDirectedDistance(const OmbEllipsoid& ellipsoid, const OmbP
     const double sigma = line.arcAt(distance);
     const double lon2 = std::remainder(from.x + line.longitude(sigma) / toRadians, 360.0);
     return {lon2, line.latitude(sigma) / toRadians, from.z};
+}
+
+namespace {
+
+// The number of equal segments of at most step in a length.
+std::size_t segmentCount(double length, double step, const char* what) {
+    constexpr double maxNodes = 1e6;
+    if (!(step > 0) || !(length / step < maxNodes)) OMB_THROW(Argument, what);
+    return std::max<std::size_t>(1, std::size_t(std::ceil(length / step)));
+}
+
+}  // namespace
+
+OmbPointArray Omb_geodesicRoute(const OmbEllipsoid& ellipsoid, const OmbPoint& from, const OmbPoint& to,
+                                double maxSegmentLength) {
+    OmbGeodesicInverse inverse = Omb_distanceAndAzimuthsVincenty(ellipsoid, from, to);
+    if (!inverse.converged) inverse = Omb_distanceAndAzimuthsExact(ellipsoid, from, to);
+    const std::size_t segments =
+        segmentCount(inverse.distance, maxSegmentLength, "geodesicRoute (maxSegmentLength must be positive)");
+    const GeodesicLine line(ellipsoid, std::clamp(from.y, -89.999999999, 89.999999999) * toRadians,
+                            inverse.azimuth * toRadians);
+    OmbPointArray route(segments + 1);
+    for (std::size_t k = 0; k < segments; ++k) {
+        const double t = double(k) / double(segments);
+        const double sigma = line.arcAt(t * inverse.distance);
+        route[k] = {std::remainder(from.x + line.longitude(sigma) / toRadians, 360.0), line.latitude(sigma) / toRadians,
+                    from.z + t * (to.z - from.z)};
+    }
+    route[segments] = to;
+    return route;
+}
+
+OmbPointArray Omb_greatCircleRoute(const OmbPoint& from, const OmbPoint& to, double maxSegmentDegrees) {
+    const auto unit = [](const OmbPoint& p) {
+        const double lon = p.x * toRadians, lat = p.y * toRadians;
+        return OmbPoint(std::cos(lat) * std::cos(lon), std::cos(lat) * std::sin(lon), std::sin(lat));
+    };
+    const OmbPoint a = unit(from), b = unit(to);
+    const double angle = std::atan2(a.cross(b).length3(), a.dot3(b));
+    if (angle > M_PI - 1e-12) OMB_THROW(Argument, "greatCircleRoute (antipodal points lie on many great circles)");
+    const std::size_t segments =
+        segmentCount(angle / toRadians, maxSegmentDegrees, "greatCircleRoute (maxSegmentDegrees must be positive)");
+    OmbPointArray route(segments + 1);
+    for (std::size_t k = 0; k < segments; ++k) {
+        const double t = double(k) / double(segments);
+        // Spherical interpolation; coincident points give the start.
+        const double sinAngle = std::sin(angle);
+        const OmbPoint v =
+            sinAngle < 1e-15 ? a : a * (std::sin((1 - t) * angle) / sinAngle) + b * (std::sin(t * angle) / sinAngle);
+        route[k] = {std::atan2(v.y, v.x) / toRadians, std::atan2(v.z, std::hypot(v.x, v.y)) / toRadians,
+                    from.z + t * (to.z - from.z)};
+    }
+    route[segments] = to;
+    return route;
 }

@@ -7,8 +7,10 @@
 #include <random>
 #include <sstream>
 #include <string>
+#include <tuple>
 #include <vector>
 
+#include "../errortext.h"
 #include "referencetool.h"
 
 namespace {
@@ -135,4 +137,44 @@ TEST(Geodesic, EdgeCases) {
     EXPECT_NEAR(antipodes.distance, 20003931.4586, 1e-3);
     // A pole is approached, not reached: latitudes are clamped.
     EXPECT_TRUE(std::isfinite(Omb_distanceAndAzimuthsVincenty(wgs84, OmbPoint(0, 90), OmbPoint(0, -90)).distance));
+}
+
+// Every node lies on the line: its distances from both ends add up to the
+// whole, and the first grows in equal steps.
+TEST(Geodesic, RoutesFollowTheLineInEqualSteps) {
+    const OmbEllipsoid wgs84;
+    const OmbPoint newYork(-74.0, 40.7, 0), tokyo(139.7, 35.7, 1000);
+    const OmbPointArray geodesic = Omb_geodesicRoute(wgs84, newYork, tokyo, 500000);
+    const OmbPointArray greatCircle = Omb_greatCircleRoute(newYork, tokyo, 5);
+    // GeodSolve on the unit sphere gives arcs for the great circle.
+    for (const auto& [route, options, step] : {std::tuple(&geodesic, std::string("-i"), 500000.0),
+                                               std::tuple(&greatCircle, std::string("-i -e 1 0"), 5 * M_PI / 180)}) {
+        std::vector<std::string> lines;
+        char line[160];
+        for (const OmbPoint& p : *route) {
+            std::snprintf(line, sizeof line, "%.12f %.12f %.12f %.12f", newYork.y, newYork.x, p.y, p.x);
+            lines.push_back(line);
+            std::snprintf(line, sizeof line, "%.12f %.12f %.12f %.12f", p.y, p.x, tokyo.y, tokyo.x);
+            lines.push_back(line);
+        }
+        const auto distances = geodSolve(options, lines);
+        ASSERT_EQ(distances.size(), lines.size()) << "GeodSolve (geographiclib-tools) is needed";
+        const double whole = distances[1][2];
+        const std::size_t segments = route->size() - 1;
+        EXPECT_EQ(segments, std::size_t(std::ceil(whole / step)));
+        const double tolerance = std::max(whole * 1e-10, 2e-9);  // GeodSolve prints nine decimals
+        for (std::size_t k = 0; k <= segments; ++k) {
+            EXPECT_NEAR(distances[2 * k][2] + distances[2 * k + 1][2], whole, tolerance) << k;
+            EXPECT_NEAR(distances[2 * k][2], whole * double(k) / double(segments), tolerance) << k;
+        }
+        EXPECT_EQ(route->back(), tokyo);
+        EXPECT_NEAR((*route)[segments / 2].z, 500, 500.0 / double(segments) + 1e-9);
+    }
+    EXPECT_EQ(errorOf([&] { Omb_geodesicRoute(wgs84, newYork, tokyo, 0); }),
+              "Invalid argument in geodesicRoute (maxSegmentLength must be positive).");
+    EXPECT_EQ(errorOf([] {
+                  Omb_greatCircleRoute({10, 20}, {-170, -20}, 1);
+              }),
+              "Invalid argument in greatCircleRoute (antipodal points lie on many great circles).");
+    EXPECT_EQ(Omb_greatCircleRoute({10, 20}, {10, 20}, 1).size(), 2u);
 }

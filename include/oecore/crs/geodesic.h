@@ -5,7 +5,7 @@
 #pragma once
 
 #include <oecore/crs/ellipsoid.h>
-#include <oecore/linalg/point.h>
+#include <oecore/linalg/pointarray.h>
 
 struct OmbGeodesicInverse {
     double distance = 0;
@@ -27,3 +27,14 @@ OmbGeodesicInverse Omb_distanceAndAzimuthsExact(const OmbEllipsoid& ellipsoid, c
                                                 const OmbPoint& to);
 OmbPoint Omb_pointPlusDirectedDistance(const OmbEllipsoid& ellipsoid, const OmbPoint& from, double azimuth,
                                        double distance);
+
+// The geodesic from one point to another as nodes no more than
+// maxSegmentLength metres apart along it, equally spaced, both ends
+// included; heights are interpolated. OmbXArgument for a length that is not
+// positive or that would need more than a million nodes.
+OmbPointArray Omb_geodesicRoute(const OmbEllipsoid& ellipsoid, const OmbPoint& from, const OmbPoint& to,
+                                double maxSegmentLength);
+// The great circle on the sphere through two long/lat points, as nodes no
+// more than maxSegmentDegrees of arc apart; the same conditions, and
+// OmbXArgument for antipodal points, which many great circles join.
+OmbPointArray Omb_greatCircleRoute(const OmbPoint& from, const OmbPoint& to, double maxSegmentDegrees);
