@@ -142,7 +142,8 @@ TEST_F(Projections, PredefinedProjectionsAndUnits) {
     EXPECT_EQ(stockholm->authorityCode(), OmbString("19929"));
     EXPECT_EQ(stockholm->falseEasting(), 1500000);
     EXPECT_EQ(predefined("Projections.mercator1SP_web").get(), OmbProjection::mercator1SPWeb().get());
-    EXPECT_TRUE(predefined("Projections.TM_2_5gonW_SWEREF99"));
+    EXPECT_EQ(predefined("Projections.TM_2_5gonW_SWEREF99").get(), OmbProjection::tm2_5gonWSweref99().get());
+    EXPECT_EQ(predefined("Projections.EuropeConformal2001")->authorityCode(), OmbString("19985"));
     EXPECT_TRUE(predefined("Projections.mercatorMeter"));
     // One degree is 60 nautical miles on the predefined spherical Mercator.
     const BoundProjection meter(OmbProjection::mercator1SP());

@@ -68,6 +68,24 @@ OMB_DESCRIBE_ENUM(OmbUTMHemisphere, "UTMHemisphere", {{"North", 0}, {"South", 1}
 enum class OmbEarthShape { Sphere = 0, Ellipsoid = 1 };
 OMB_DESCRIBE_ENUM(OmbEarthShape, "EarthShape", {{"Sphere", 0}, {"Ellipsoid", 1}})
 
+// Every predefined projection: registered name, accessor.
+// clang-format off
+#define OMB_PREDEFINED_PROJECTIONS(X) \
+    X(TM2_5gonWStockholm, tm2_5gonWStockholm) \
+    X(screenProjection, screenProjection) \
+    X(LongLat, longLat) \
+    X(TM7_5gonWStockholm, tm7_5gonWStockholm) \
+    X(TM_2_5gonW_SWEREF99, tm2_5gonWSweref99) \
+    X(mercatorMeter, mercatorMeter) \
+    X(mercator1SP, mercator1SP) \
+    X(mercator1SP_ellipsoid, mercator1SPEllipsoid) \
+    X(mercator1SP_web, mercator1SPWeb) \
+    X(miller1SP, miller1SP) \
+    X(UPS_North, upsNorth) \
+    X(UPS_South, upsSouth) \
+    X(EuropeConformal2001, europeConformal2001)
+// clang-format on
+
 class OmbProjection : public OmbResourceObject {
     OMB_DECLARE_ENGINE_CLASS()
 
@@ -152,12 +170,9 @@ public:
 
     // The predefined projections, while the runtime is initialised
     // (registered as "Projections." + name).
-    static const OmbRef<OmbProjection>& longLat();
-    static const OmbRef<OmbProjection>& screenProjection();
-    static const OmbRef<OmbProjection>& mercator1SP();
-    static const OmbRef<OmbProjection>& mercator1SPEllipsoid();
-    static const OmbRef<OmbProjection>& mercator1SPWeb();
-    static const OmbRef<OmbProjection>& miller1SP();
+#define OMB_PROJECTION_ACCESSOR(NAME, ACCESSOR) static const OmbRef<OmbProjection>& ACCESSOR();
+    OMB_PREDEFINED_PROJECTIONS(OMB_PROJECTION_ACCESSOR)
+#undef OMB_PROJECTION_ACCESSOR
     static void createPredefined();
     static void destroyPredefined();
 
