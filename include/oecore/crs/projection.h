@@ -68,6 +68,38 @@ OMB_DESCRIBE_ENUM(OmbUTMHemisphere, "UTMHemisphere", {{"North", 0}, {"South", 1}
 enum class OmbEarthShape { Sphere = 0, Ellipsoid = 1 };
 OMB_DESCRIBE_ENUM(OmbEarthShape, "EarthShape", {{"Sphere", 0}, {"Ellipsoid", 1}})
 
+// The shape a method with a spherical variant works on: the datum's
+// ellipsoid, or a sphere whose radius comes from a source.
+class OmbEarthShapeParameters {
+public:
+    OmbEarthShape shape() const noexcept { return shape_; }
+    void shape(OmbEarthShape shape) { shape_ = shape; }
+    // In metres, used with "#radiusFromArgument".
+    double sphereRadius() const noexcept { return sphereRadius_; }
+    void sphereRadius(double metres) { sphereRadius_ = metres; }
+    // One of the sources OmbProjCachedNumbers::sphereRadius takes.
+    const OmbString& sphereRadiusSource() const noexcept { return sphereRadiusSource_; }
+    void sphereRadiusSource(const OmbString& source) { sphereRadiusSource_ = source; }
+
+    // The sphere's radius on cached's ellipsoid (the mean radius of
+    // curvature at latitude where the source asks for it).
+    double sphereRadiusFor(const OmbProjCachedNumbers& cached, double latitude) const {
+        return cached.sphereRadius(sphereRadiusSource_, sphereRadius_, latitude);
+    }
+    bool sameEarthShape(const OmbEarthShapeParameters& other) const {
+        return shape_ == other.shape_ && sphereRadius_ == other.sphereRadius_ &&
+               sphereRadiusSource_ == other.sphereRadiusSource_;
+    }
+
+protected:
+    explicit OmbEarthShapeParameters(OmbEarthShape shape) : shape_(shape) {}
+
+private:
+    OmbEarthShape shape_;
+    double sphereRadius_ = 0;
+    OmbString sphereRadiusSource_;
+};
+
 // Every predefined projection: registered name, accessor.
 // clang-format off
 #define OMB_PREDEFINED_PROJECTIONS(X) \

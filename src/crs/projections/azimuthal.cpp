@@ -38,15 +38,7 @@ OMB_DESCRIBE_CLASS(OmbAzimuthalGlobal) {
 }
 
 OMB_DESCRIBE_CLASS(OmbAzimuthalEquidistant) {
-    using A = OmbAzimuthalEquidistant;
-    d.property<OmbEarthShape>(
-        "Shape", [](const A& p) { return p.shape(); }, [](A& p, OmbEarthShape v) { p.shape(v); },
-        OmbEarthShape::Ellipsoid);
-    d.property<double>(
-        "SphereRadius", [](const A& p) { return p.sphereRadius(); }, [](A& p, double v) { p.sphereRadius(v); });
-    d.property<OmbString>(
-        "SphereRadiusSource", [](const A& p) { return p.sphereRadiusSource(); },
-        [](A& p, const OmbString& v) { p.sphereRadiusSource(v); });
+    Omb_describeEarthShape(d, OmbEarthShape::Ellipsoid);
 }
 
 void OmbAzimuthalGlobal::set(double centralLongitude, double centralLatitude) {
@@ -74,7 +66,7 @@ public:
         : OmbProjCachedNumbers(datum, p.metersPerProjUnit()), ellipsoid(datum.ellipsoid()) {
         centre = OmbPoint(p.centralLongitude(), p.centralLatitude());
         sphere = p.shape() == OmbEarthShape::Sphere;
-        radius = sphere ? sphereRadius(p.sphereRadiusSource(), p.sphereRadius(), p.centralLatitude()) : a;
+        radius = sphere ? p.sphereRadiusFor(*this, p.centralLatitude()) : a;
         const double lat0 = centre.y * radiansPerDegree;
         sinLat0 = std::sin(lat0), cosLat0 = std::cos(lat0);
         falseEasting = p.falseEasting(), falseNorthing = p.falseNorthing();
@@ -146,5 +138,5 @@ bool OmbAzimuthalEquidistant::isValid(const OmbPoint& lola, const OmbProjCachedN
 bool OmbAzimuthalEquidistant::equivalent(const OmbProjection& other) const {
     if (!sameAzimuthalParameters(other)) return false;
     const auto& a = static_cast<const OmbAzimuthalEquidistant&>(other);
-    return shape_ == a.shape_ && sphereRadius_ == a.sphereRadius_ && sphereRadiusSource_ == a.sphereRadiusSource_;
+    return sameEarthShape(a);
 }

@@ -27,14 +27,7 @@ OMB_DESCRIBE_CLASS(OmbEquidistantCylindrical) {
     d.property<double>(
         "StandardParallel", [](const E& p) { return p.standardParallel(); },
         [](E& p, double v) { p.standardParallel(v); });
-    d.property<OmbEarthShape>(
-        "Shape", [](const E& p) { return p.shape(); }, [](E& p, OmbEarthShape v) { p.shape(v); },
-        OmbEarthShape::Ellipsoid);
-    d.property<double>(
-        "SphereRadius", [](const E& p) { return p.sphereRadius(); }, [](E& p, double v) { p.sphereRadius(v); });
-    d.property<OmbString>(
-        "SphereRadiusSource", [](const E& p) { return p.sphereRadiusSource(); },
-        [](E& p, const OmbString& v) { p.sphereRadiusSource(v); });
+    Omb_describeEarthShape(d, OmbEarthShape::Ellipsoid);
 }
 
 OMB_DESCRIBE_CLASS(OmbEquidistantCylindricalAngularProjection) {
@@ -60,7 +53,7 @@ public:
         : OmbMeriDistProjCachedNumbers(datum, p.metersPerProjUnit(), p.centralLatitude()) {
         sphere = p.shape() == OmbEarthShape::Sphere;
         const double lat1 = p.standardParallel() * radiansPerDegree;
-        radius = sphere ? sphereRadius(p.sphereRadiusSource(), p.sphereRadius(), p.standardParallel()) : a;
+        radius = sphere ? p.sphereRadiusFor(*this, p.standardParallel()) : a;
         const double parallelRadius =
             sphere ? radius * std::cos(lat1) : primeVerticalRadius(std::sin(lat1)) * std::cos(lat1);
         kx = parallelRadius * radiansPerDegree * unitsPerMeter;
@@ -107,8 +100,7 @@ void OmbEquidistantCylindrical::nominalMetersXY(const OmbProjCachedNumbers* cach
 bool OmbEquidistantCylindrical::equivalent(const OmbProjection& other) const {
     if (!sameParameters(other)) return false;
     const auto& e = static_cast<const OmbEquidistantCylindrical&>(other);
-    return standardParallel_ == e.standardParallel_ && shape_ == e.shape_ && sphereRadius_ == e.sphereRadius_ &&
-           sphereRadiusSource_ == e.sphereRadiusSource_;
+    return standardParallel_ == e.standardParallel_ && sameEarthShape(e);
 }
 
 // --- angular ----------------------------------------------------------------------

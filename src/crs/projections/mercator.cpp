@@ -30,14 +30,7 @@ OMB_DESCRIBE_CLASS(OmbMercator) {
     d.property<double>(
         "StandardParallel", [](const M& p) { return p.standardParallel(); },
         [](M& p, double v) { p.standardParallel(v); });
-    d.property<OmbEarthShape>(
-        "Shape", [](const M& p) { return p.shape(); }, [](M& p, OmbEarthShape v) { p.shape(v); },
-        OmbEarthShape::Sphere);
-    d.property<double>(
-        "SphereRadius", [](const M& p) { return p.sphereRadius(); }, [](M& p, double v) { p.sphereRadius(v); });
-    d.property<OmbString>(
-        "SphereRadiusSource", [](const M& p) { return p.sphereRadiusSource(); },
-        [](M& p, const OmbString& v) { p.sphereRadiusSource(v); });
+    Omb_describeEarthShape(d, OmbEarthShape::Sphere);
 }
 
 OMB_DESCRIBE_CLASS(OmbMiller) {
@@ -57,8 +50,7 @@ public:
     MercatorCachedNumbers(const OmbGeodeticDatum& datum, const OmbMercator& m, double compromiseFactor)
         : OmbProjCachedNumbers(datum, m.metersPerProjUnit()), compromise(compromiseFactor) {
         ellipsoidal = m.shape() == OmbEarthShape::Ellipsoid && compromise == 1;
-        const double radius =
-            ellipsoidal ? a : sphereRadius(m.sphereRadiusSource(), m.sphereRadius(), m.standardParallel());
+        const double radius = ellipsoidal ? a : m.sphereRadiusFor(*this, m.standardParallel());
         double k0 = m.scaleFactor();
         if (m.standardParallel() != 0) {
             const double lat1 = m.standardParallel() * radiansPerDegree;
@@ -152,7 +144,7 @@ inline void inverse(const MercatorCachedNumbers& c, OmbPoint& p) {
 
 }  // namespace
 
-OmbMercator::OmbMercator() : OmbProjection(true, false) {}
+OmbMercator::OmbMercator() : OmbProjection(true, false), OmbEarthShapeParameters(OmbEarthShape::Sphere) {}
 
 void OmbMercator::standardParallel(double degrees) {
     if (!(degrees >= -89 && degrees <= 89))
@@ -185,8 +177,7 @@ void OmbMercator::nominalMetersXY(const OmbProjCachedNumbers* cached, double& mx
 bool OmbMercator::equivalent(const OmbProjection& other) const {
     if (!sameParameters(other)) return false;
     const auto& m = static_cast<const OmbMercator&>(other);
-    return standardParallel_ == m.standardParallel_ && shape_ == m.shape_ && sphereRadius_ == m.sphereRadius_ &&
-           sphereRadiusSource_ == m.sphereRadiusSource_;
+    return standardParallel_ == m.standardParallel_ && sameEarthShape(m);
 }
 
 bool OmbMercator::compatibleWith(const OmbMercator& other, double worldWidth) const {
@@ -198,8 +189,7 @@ bool OmbMercator::compatibleWith(const OmbMercator& other, double worldWidth) co
     return std::fabs(turns - std::round(turns)) * worldWidth <= 1e-5 &&
            std::fabs(scaleFactor() - other.scaleFactor()) <= 1e-9 &&
            std::fabs(standardParallel_ - other.standardParallel_) <= 1e-9 && falseNorthing() == other.falseNorthing() &&
-           shape_ == other.shape_ && sphereRadius_ == other.sphereRadius_ &&
-           sphereRadiusSource_ == other.sphereRadiusSource_ && compromiseFactor() == other.compromiseFactor() &&
+           sameEarthShape(other) && compromiseFactor() == other.compromiseFactor() &&
            lengthUnit()->equivalent(*other.lengthUnit());
 }
 

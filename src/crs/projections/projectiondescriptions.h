@@ -35,3 +35,14 @@ void Omb_describeScaleFactor(OmbDescriptionBuilder<T>& d) {
     d.template property<double>(
         "ScaleFactor", [](const T& p) { return p.scaleFactor(); }, [](T& p, double v) { p.scaleFactor(v); }, 1.0);
 }
+
+template <class T>
+void Omb_describeEarthShape(OmbDescriptionBuilder<T>& d, OmbEarthShape defaultShape) {
+    d.template property<OmbEarthShape>(
+        "Shape", [](const T& p) { return p.shape(); }, [](T& p, OmbEarthShape v) { p.shape(v); }, defaultShape);
+    d.template property<double>(
+        "SphereRadius", [](const T& p) { return p.sphereRadius(); }, [](T& p, double v) { p.sphereRadius(v); });
+    d.template property<OmbString>(
+        "SphereRadiusSource", [](const T& p) { return p.sphereRadiusSource(); },
+        [](T& p, const OmbString& v) { p.sphereRadiusSource(v); });
+}

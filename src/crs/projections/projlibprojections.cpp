@@ -44,15 +44,7 @@ OMB_DESCRIBE_CLASS(OmbAlbersEqualAreaConic) {
 }
 
 OMB_DESCRIBE_CLASS(OmbAzimuthalEqualArea) {
-    using A = OmbAzimuthalEqualArea;
-    d.property<OmbEarthShape>(
-        "Shape", [](const A& p) { return p.shape(); }, [](A& p, OmbEarthShape v) { p.shape(v); },
-        OmbEarthShape::Ellipsoid);
-    d.property<double>(
-        "SphereRadius", [](const A& p) { return p.sphereRadius(); }, [](A& p, double v) { p.sphereRadius(v); });
-    d.property<OmbString>(
-        "SphereRadiusSource", [](const A& p) { return p.sphereRadiusSource(); },
-        [](A& p, const OmbString& v) { p.sphereRadiusSource(v); });
+    Omb_describeEarthShape(d, OmbEarthShape::Ellipsoid);
 }
 
 OMB_DESCRIBE_CLASS(OmbCassiniSoldner) {
@@ -250,17 +242,16 @@ bool OmbAlbersEqualAreaConic::equivalent(const OmbProjection& other) const {
 }
 
 std::string OmbAzimuthalEqualArea::definition(const OmbProjCachedNumbers& cached) const {
-    const std::string earth =
-        shape_ == OmbEarthShape::Sphere
-            ? format("+R=", "%s%.6f", cached.sphereRadius(sphereRadiusSource_, sphereRadius_, centralLatitude()))
-            : ellipsoidParameters(cached);
+    const std::string earth = shape() == OmbEarthShape::Sphere
+                                  ? format("+R=", "%s%.6f", sphereRadiusFor(cached, centralLatitude()))
+                                  : ellipsoidParameters(cached);
     return "+proj=laea " + earth + " " + centreParameters() + " +x_0=0 +y_0=0 +no_defs";
 }
 
 bool OmbAzimuthalEqualArea::equivalent(const OmbProjection& other) const {
     if (!sameAzimuthalParameters(other)) return false;
     const auto& a = static_cast<const OmbAzimuthalEqualArea&>(other);
-    return shape_ == a.shape_ && sphereRadius_ == a.sphereRadius_ && sphereRadiusSource_ == a.sphereRadiusSource_;
+    return sameEarthShape(a);
 }
 
 std::string OmbCassiniSoldner::definition(const OmbProjCachedNumbers& cached) const {

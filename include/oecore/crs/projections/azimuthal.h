@@ -99,20 +99,13 @@ private:
 
 // Distances and azimuths from the centre are true: the geodesic to a point
 // on the ellipsoid (Vincenty), or the great circle on a sphere.
-class OmbAzimuthalEquidistant : public OmbAzimuthalGlobal {
+class OmbAzimuthalEquidistant : public OmbAzimuthalGlobal, public OmbEarthShapeParameters {
     OMB_DECLARE_ENGINE_CLASS()
     OMB_DESCRIBED_MEMBERS()
 
 public:
-    OmbAzimuthalEquidistant() = default;
+    OmbAzimuthalEquidistant() : OmbEarthShapeParameters(OmbEarthShape::Ellipsoid) {}
     OmbAzimuthalEquidistant* clone() const override { return new OmbAzimuthalEquidistant(*this); }
-
-    OmbEarthShape shape() const noexcept { return shape_; }
-    void shape(OmbEarthShape shape) { shape_ = shape; }
-    double sphereRadius() const noexcept { return sphereRadius_; }
-    void sphereRadius(double metres) { sphereRadius_ = metres; }
-    const OmbString& sphereRadiusSource() const noexcept { return sphereRadiusSource_; }
-    void sphereRadiusSource(const OmbString& source) { sphereRadiusSource_ = source; }
 
     using OmbProjection::project;
     using OmbProjection::unproject;
@@ -123,7 +116,4 @@ public:
     bool equivalent(const OmbProjection& other) const override;
 
 private:
-    OmbEarthShape shape_ = OmbEarthShape::Ellipsoid;
-    double sphereRadius_ = 0;
-    OmbString sphereRadiusSource_;
 };

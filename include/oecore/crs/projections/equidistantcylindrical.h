@@ -7,23 +7,17 @@
 
 #include <oecore/crs/projection.h>
 
-class OmbEquidistantCylindrical : public OmbProjection {
+class OmbEquidistantCylindrical : public OmbProjection, public OmbEarthShapeParameters {
     OMB_DECLARE_ENGINE_CLASS()
     OMB_DESCRIBED_MEMBERS()
 
 public:
-    OmbEquidistantCylindrical() : OmbProjection(true, false) {}
+    OmbEquidistantCylindrical() : OmbProjection(true, false), OmbEarthShapeParameters(OmbEarthShape::Ellipsoid) {}
     OmbEquidistantCylindrical* clone() const override { return new OmbEquidistantCylindrical(*this); }
 
     // The parallel of true scale in x.
     double standardParallel() const noexcept { return standardParallel_; }
     void standardParallel(double degrees) { standardParallel_ = degrees; }
-    OmbEarthShape shape() const noexcept { return shape_; }
-    void shape(OmbEarthShape shape) { shape_ = shape; }
-    double sphereRadius() const noexcept { return sphereRadius_; }
-    void sphereRadius(double metres) { sphereRadius_ = metres; }
-    const OmbString& sphereRadiusSource() const noexcept { return sphereRadiusSource_; }
-    void sphereRadiusSource(const OmbString& source) { sphereRadiusSource_ = source; }
 
     using OmbProjection::project;
     using OmbProjection::unproject;
@@ -35,9 +29,6 @@ public:
 
 private:
     double standardParallel_ = 0;
-    OmbEarthShape shape_ = OmbEarthShape::Ellipsoid;
-    double sphereRadius_ = 0;
-    OmbString sphereRadiusSource_;
 };
 
 class OmbEquidistantCylindricalAngularProjection : public OmbProjection {

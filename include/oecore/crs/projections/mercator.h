@@ -6,7 +6,7 @@
 
 #include <oecore/crs/projection.h>
 
-class OmbMercator : public OmbProjection {
+class OmbMercator : public OmbProjection, public OmbEarthShapeParameters {
     OMB_DECLARE_ENGINE_CLASS()
     OMB_DESCRIBED_MEMBERS()
 
@@ -18,15 +18,6 @@ public:
     // in place of scaleFactor.
     double standardParallel() const noexcept { return standardParallel_; }
     void standardParallel(double degrees);
-    OmbEarthShape shape() const noexcept { return shape_; }
-    void shape(OmbEarthShape shape) { shape_ = shape; }
-    // The sphere's radius in metres, used with "#radiusFromArgument".
-    double sphereRadius() const noexcept { return sphereRadius_; }
-    void sphereRadius(double metres) { sphereRadius_ = metres; }
-    // "#equatorialRadius" (the default), "#meanRadiusOfCurvatureAtStandardParallel",
-    // "#equalArea" or "#radiusFromArgument".
-    const OmbString& sphereRadiusSource() const noexcept { return sphereRadiusSource_; }
-    void sphereRadiusSource(const OmbString& source) { sphereRadiusSource_ = source; }
 
     using OmbProjection::project;
     using OmbProjection::unproject;
@@ -51,9 +42,6 @@ protected:
 
 private:
     double standardParallel_ = 0;
-    OmbEarthShape shape_ = OmbEarthShape::Sphere;
-    double sphereRadius_ = 0;
-    OmbString sphereRadiusSource_;
 };
 
 class OmbMiller : public OmbMercator {

@@ -53,25 +53,17 @@ private:
     double standardParallel2_ = 0;
 };
 
-class OmbAzimuthalEqualArea : public OmbProjLibEvaluated<OmbAzimuthalGlobal> {
+class OmbAzimuthalEqualArea : public OmbProjLibEvaluated<OmbAzimuthalGlobal>, public OmbEarthShapeParameters {
     OMB_DECLARE_ENGINE_CLASS()
     OMB_DESCRIBED_MEMBERS()
 
 public:
+    OmbAzimuthalEqualArea() : OmbEarthShapeParameters(OmbEarthShape::Ellipsoid) {}
     OmbAzimuthalEqualArea* clone() const override { return new OmbAzimuthalEqualArea(*this); }
-    OmbEarthShape shape() const noexcept { return shape_; }
-    void shape(OmbEarthShape shape) { shape_ = shape; }
-    double sphereRadius() const noexcept { return sphereRadius_; }
-    void sphereRadius(double metres) { sphereRadius_ = metres; }
-    const OmbString& sphereRadiusSource() const noexcept { return sphereRadiusSource_; }
-    void sphereRadiusSource(const OmbString& source) { sphereRadiusSource_ = source; }
     std::string definition(const OmbProjCachedNumbers& cached) const override;
     bool equivalent(const OmbProjection& other) const override;
 
 private:
-    OmbEarthShape shape_ = OmbEarthShape::Ellipsoid;
-    double sphereRadius_ = 0;
-    OmbString sphereRadiusSource_;
 };
 
 class OmbCassiniSoldner : public OmbProjLibEvaluated<OmbProjection> {
