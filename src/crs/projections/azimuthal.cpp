@@ -37,9 +37,7 @@ OMB_DESCRIBE_CLASS(OmbAzimuthalGlobal) {
         OmbProjectionPurpose::Presentation);
 }
 
-OMB_DESCRIBE_CLASS(OmbAzimuthalEquidistant) {
-    Omb_describeEarthShape(d, OmbEarthShape::Ellipsoid);
-}
+OMB_DESCRIBE_CLASS(OmbAzimuthalEquidistant) { Omb_describeEarthShape(d, OmbEarthShape::Ellipsoid); }
 
 void OmbAzimuthalGlobal::set(double centralLongitude, double centralLatitude) {
     if (!(centralLongitude >= -180 && centralLongitude <= 180 && centralLatitude >= -90 && centralLatitude <= 90))

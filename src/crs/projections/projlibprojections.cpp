@@ -43,9 +43,7 @@ OMB_DESCRIBE_CLASS(OmbAlbersEqualAreaConic) {
         .required();
 }
 
-OMB_DESCRIBE_CLASS(OmbAzimuthalEqualArea) {
-    Omb_describeEarthShape(d, OmbEarthShape::Ellipsoid);
-}
+OMB_DESCRIBE_CLASS(OmbAzimuthalEqualArea) { Omb_describeEarthShape(d, OmbEarthShape::Ellipsoid); }
 
 OMB_DESCRIBE_CLASS(OmbCassiniSoldner) {
     Omb_describeCentre(d);
