@@ -52,6 +52,7 @@
 #include <oecore/linalg/rect.h>
 
 #include <oecore/crs/datumshift.h>
+#include <oecore/crs/datumshiftinfo.h>
 #include <oecore/crs/ellipsoid.h>
 #include <oecore/crs/geodesic.h>
 #include <oecore/crs/geodeticdatum.h>

@@ -31,6 +31,9 @@ OMB_DESCRIBE_CLASS(OmbDatumShift) {
     d.object<OmbGeodeticDatum>(
         "KnownDatum", [](const OmbDatumShift& s) { return s.knownDatum(); },
         [](OmbDatumShift& s, const OmbRef<OmbGeodeticDatum>& v) { s.knownDatum(v); });
+    d.object<OmbDatumShiftInfo>(
+        "Info", [](const OmbDatumShift& s) { return s.info(); },
+        [](OmbDatumShift& s, const OmbRef<OmbDatumShiftInfo>& v) { s.info(v); });
 }
 
 namespace {
@@ -103,7 +106,8 @@ OmbDatumShift::OmbDatumShift(const OmbDatumShift& other)
     : OmbResourceObject(other),
       authority_(other.authority_),
       authorityCode_(other.authorityCode_),
-      knownDatum_(other.knownDatum_) {}
+      knownDatum_(other.knownDatum_),
+      info_(other.info_) {}
 
 OmbDatumShiftStatus OmbDatumShift::changeDatumToKnownDatumNoExceptions(const OmbGeodeticDatum& datum,
                                                                        OmbPoint& p) const {

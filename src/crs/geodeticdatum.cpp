@@ -22,6 +22,9 @@ OMB_DESCRIBE_CLASS(OmbGeodeticDatum) {
     d.object<OmbDatumShift>(
         "DatumShift", [](const D& x) { return x.datumShift(); },
         [](D& x, const OmbRef<OmbDatumShift>& v) { x.datumShift(v); });
+    d.collection<OmbDatumShiftInfoVec>(
+        "AlternativeDatumShifts", "DatumShiftInfoCollection", [](const D& x) { return x.alternativeDatumShifts(); },
+        [](D& x, const OmbRef<OmbDatumShiftInfoVec>& v) { x.alternativeDatumShifts(v); });
 }
 
 namespace {
@@ -155,3 +158,11 @@ void OmbGeodeticDatum::createPredefined() {
 }
 
 void OmbGeodeticDatum::destroyPredefined() { wgs84Datum.reset(); }
+
+OmbRef<OmbDatumShiftInfoVec> OmbGeodeticDatum::alternativeDatumShiftsForArea(const OmbRect& lola) const {
+    OmbRef<OmbDatumShiftInfoVec> found(new OmbDatumShiftInfoVec);
+    if (alternatives_)
+        for (const OmbRef<OmbDatumShiftInfo>& info : *alternatives_)
+            if (info && info->appliesTo(lola)) found->add(info);
+    return found;
+}

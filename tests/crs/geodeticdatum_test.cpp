@@ -179,8 +179,19 @@ TEST_F(Datums, DatumsReadFromConfigurations) {
                   "<GeodeticDatum Name='OSGB36' Public='true' Authority='epsg' AuthorityCode='6277'"
                   " Ellipsoid='{ResourceReference Predefined=true, Value=Ellipsoids.Airy1830}'>"
                   "<GeodeticDatum.DatumShift><HelmertDatumShift DX='446.448' DY='-125.157' DZ='542.06'"
-                  " RotationX='0.15' RotationY='0.247' RotationZ='0.842' ScaleDifference='-20.489'/>"
-                  "</GeodeticDatum.DatumShift></GeodeticDatum></Configuration>"),
+                  " RotationX='0.15' RotationY='0.247' RotationZ='0.842' ScaleDifference='-20.489'>"
+                  "<HelmertDatumShift.Info><DatumShiftInfo Name='OSGB36 to WGS 84 (6)' Authority='epsg'"
+                  " AuthorityCode='1314' HorizontalAccuracy='2' AreaOfUseWest='-8.82' AreaOfUseSouth='49.79'"
+                  " AreaOfUseEast='1.92' AreaOfUseNorth='60.94'/></HelmertDatumShift.Info>"
+                  "</HelmertDatumShift></GeodeticDatum.DatumShift>"
+                  "<GeodeticDatum.AlternativeDatumShifts><DatumShiftInfoCollection>"
+                  "<DatumShiftInfo Name='OSTN15' AuthorityCode='7953' AreaOfUseWest='-9' AreaOfUseSouth='49'"
+                  " AreaOfUseEast='2' AreaOfUseNorth='61'/>"
+                  "<DatumShiftInfo Name='Channel Islands' AreaOfUseWest='-3' AreaOfUseSouth='49'"
+                  " AreaOfUseEast='-2' AreaOfUseNorth='50'/>"
+                  "<DatumShiftInfo Name='Unbounded' DatumShiftChoice='Lenient'/>"
+                  "</DatumShiftInfoCollection></GeodeticDatum.AlternativeDatumShifts>"
+                  "</GeodeticDatum></Configuration>"),
         {}, OmbDataSetInitialization::Delayed, {});
     const auto read = omb_dynamic_cast<OmbGeodeticDatum>(c->getPublicObject(OmbString("OSGB36")));
     ASSERT_TRUE(read);
@@ -193,5 +204,20 @@ TEST_F(Datums, DatumsReadFromConfigurations) {
     const OmbString saved = read->save();
     EXPECT_NE(saved.find(OmbString("Value=\"Ellipsoids.Airy1830\" Predefined=\"true\"")), -1) << saved;
     const auto again = OmbXmlParser::loadString(saved, {}, OmbDataSetInitialization::Delayed, {});
-    EXPECT_TRUE(again->getPublicObject(OmbString("OSGB36")));
+    const auto reread = omb_dynamic_cast<OmbGeodeticDatum>(again->getPublicObject(OmbString("OSGB36")));
+    ASSERT_TRUE(reread);
+    // The shift's description and the alternatives, chosen by area.
+    for (const auto& datum : {read, reread}) {
+        const auto& info = datum->datumShift()->info();
+        ASSERT_TRUE(info);
+        EXPECT_EQ(info->authorityCode, OmbString("1314"));
+        EXPECT_EQ(info->horizontalAccuracy, 2);
+        EXPECT_EQ(info->areaOfUse, OmbRect(-8.82, 49.79, 1.92, 60.94));
+        ASSERT_EQ(datum->alternativeDatumShifts()->size(), 3u);
+        EXPECT_EQ(datum->alternativeDatumShifts()->get(2)->datumShiftChoice, OmbDatumShiftChoice::Lenient);
+        const auto inLondon = datum->alternativeDatumShiftsForArea({-0.2, 51.4, 0, 51.6});
+        ASSERT_EQ(inLondon->size(), 2u);
+        EXPECT_EQ(inLondon->get(0)->name(), OmbString("OSTN15"));
+        EXPECT_EQ(inLondon->get(1)->name(), OmbString("Unbounded"));
+    }
 }

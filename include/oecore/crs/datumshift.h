@@ -9,6 +9,7 @@
 #include <oecore/config/classdescription.h>
 #include <oecore/core/refvec.h>
 #include <oecore/core/resourceobject.h>
+#include <oecore/crs/datumshiftinfo.h>
 #include <oecore/linalg/point.h>
 
 #include <array>
@@ -41,6 +42,9 @@ public:
     virtual bool equivalent(const OmbDatumShift& other) const = 0;
     // Whether the shift changes nothing.
     virtual bool zeroShifts() const = 0;
+    // What is known about the shift; null when nothing is.
+    virtual const OmbRef<OmbDatumShiftInfo>& info() const { return info_; }
+    void info(const OmbRef<OmbDatumShiftInfo>& info) { info_ = info; }
 
     const OmbString& authority() const noexcept { return authority_; }
     void authority(const OmbString& a) { authority_ = a; }
@@ -65,6 +69,7 @@ private:
     OmbString authority_;
     OmbString authorityCode_;
     OmbRef<OmbGeodeticDatum> knownDatum_;
+    OmbRef<OmbDatumShiftInfo> info_;
     std::atomic<bool> owned_{false};
 };
 

@@ -34,6 +34,12 @@ public:
     const OmbRef<OmbDatumShift>& datumShift() const noexcept { return datumShift_; }
     void datumShift(const OmbRef<OmbDatumShift>& shift);
 
+    // Other known shifts of this datum, described (null when none), and
+    // those whose area of use meets a long/lat rectangle.
+    const OmbRef<OmbDatumShiftInfoVec>& alternativeDatumShifts() const noexcept { return alternatives_; }
+    void alternativeDatumShifts(const OmbRef<OmbDatumShiftInfoVec>& alternatives) { alternatives_ = alternatives; }
+    OmbRef<OmbDatumShiftInfoVec> alternativeDatumShiftsForArea(const OmbRect& lola) const;
+
     // The prime meridian in degrees east of Greenwich.
     double primeMeridianDegrees() const { return primeMeridian_ ? primeMeridian_->longitudeFromGreenwich() : 0; }
 
@@ -62,4 +68,5 @@ private:
     OmbRef<OmbEllipsoid> ellipsoid_;
     OmbRef<OmbPrimeMeridian> primeMeridian_;
     OmbRef<OmbDatumShift> datumShift_;
+    OmbRef<OmbDatumShiftInfoVec> alternatives_;
 };
