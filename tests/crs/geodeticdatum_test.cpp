@@ -221,3 +221,34 @@ TEST_F(Datums, DatumsReadFromConfigurations) {
         EXPECT_EQ(inLondon->get(1)->name(), OmbString("Unbounded"));
     }
 }
+
+TEST_F(Datums, ShiftsAreBuiltFromTheEpsgCatalogue) {
+    const auto fromCode = [](const char* authority, const char* code) {
+        OmbRef<OmbDatumShiftInfo> info(new OmbDatumShiftInfo);
+        info->authority = OmbString(authority);
+        info->authorityCode = OmbString(code);
+        return OmbDatumShift::fromInfo(info);
+    };
+    const auto helmert = [](const OmbRef<OmbDatumShift>& shift) {
+        const auto h = omb_dynamic_cast<OmbHelmertDatumShift>(shift);
+        EXPECT_TRUE(h);
+        return h ? h->parameters() : OmbHelmertDatumShift::Parameters();
+    };
+    const auto osgbShift = fromCode("EPSG", "1314");
+    EXPECT_EQ(helmert(osgbShift), osgb());
+    EXPECT_EQ(osgbShift->authorityCode(), OmbString("1314"));
+    EXPECT_EQ(osgbShift->info()->authorityCode, OmbString("1314"));
+    const auto belgian = helmert(fromCode("epsg", "15929"));
+    EXPECT_EQ(belgian.convention, OmbRotationSignConvention::CoordinateFrameRotation);
+    EXPECT_NEAR(belgian.rz, -1.8422, 1e-12);
+    EXPECT_NEAR(belgian.scaleDifference, -1.2747, 1e-12);
+    const auto nad27 = helmert(fromCode("epsg", "1173"));
+    EXPECT_EQ(nad27.dy, 160);
+    EXPECT_EQ(nad27.rx, 0);
+    EXPECT_EQ(errorOf([&] { fromCode("epsg", "1241"); }),
+              "The datum shift code epsg:1241 (not a Helmert transformation) is not supported.");
+    EXPECT_EQ(errorOf([&] { fromCode("esri", "108001"); }),
+              "The datum shift code esri:108001 (not an EPSG code) is not supported.");
+    EXPECT_EQ(errorOf([&] { fromCode("epsg", "99999999"); }),
+              "The datum shift code epsg:99999999 (not in the catalogue) is not supported.");
+}

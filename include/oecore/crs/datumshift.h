@@ -54,6 +54,14 @@ public:
     const OmbRef<OmbGeodeticDatum>& knownDatum() const noexcept { return knownDatum_; }
     void knownDatum(const OmbRef<OmbGeodeticDatum>& datum) { knownDatum_ = datum; }
 
+    // A shift built from what the EPSG catalogue (PROJ's database) holds
+    // under info's code: a geocentric-translation, position-vector or
+    // coordinate-frame transformation between a datum and WGS 84, applied in
+    // the direction the catalogue states. The shift keeps info.
+    // OmbXUnsupportedDatumShiftCode for another authority, an unknown code
+    // or another method.
+    static OmbRef<OmbDatumShift> fromInfo(const OmbRef<OmbDatumShiftInfo>& info);
+
     // One shift belongs to one datum.
     bool takeOwnership(int = 0) {
         bool expected = false;

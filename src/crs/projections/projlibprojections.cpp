@@ -103,6 +103,7 @@ public:
     }
 
     void create(const OmbProjection& projection, const std::string& definition) {
+        proj_log_level(context, PJ_LOG_NONE);  // failures become exceptions
         pj = proj_create(context, definition.c_str());
         if (!pj)
             OMB_THROW(ProjectionError, projection.name().empty() ? projection.myRuntimeClassName() : projection.name(),

@@ -1,0 +1,97 @@
+// Datum shifts built from the EPSG catalogue in PROJ's database.
+#include <oecore/core/exception.h>
+#include <oecore/crs/datumshift.h>
+
+#include <proj.h>
+
+#include <cstring>
+#include <memory>
+#include <string>
+
+namespace {
+
+constexpr double arcSecondsPerRadian = 206264.80624709636;
+
+// EPSG method codes of the Helmert family, each in its geocentric, 2D and
+// 3D geographic domain.
+bool isTranslation(int method) { return method == 1031 || method == 9603 || method == 1035; }
+bool isPositionVector(int method) { return method == 1033 || method == 9606 || method == 1037; }
+bool isCoordinateFrame(int method) { return method == 1032 || method == 9607 || method == 1038; }
+
+// PROJ objects released with their owner.
+struct ContextDeleter {
+    void operator()(PJ_CONTEXT* c) const { proj_context_destroy(c); }
+};
+struct ObjectDeleter {
+    void operator()(PJ* p) const { proj_destroy(p); }
+};
+using Context = std::unique_ptr<PJ_CONTEXT, ContextDeleter>;
+using Object = std::unique_ptr<PJ, ObjectDeleter>;
+
+[[noreturn]] void unsupported(const OmbDatumShiftInfo& info, const std::string& why) {
+    OMB_THROW(UnsupportedDatumShiftCode, info.authority + ":" + info.authorityCode + " (" + OmbString(why) + ")");
+}
+
+// Whether a CRS's datum is WGS 84 (EPSG 6326, or an ensemble holding it).
+bool onWgs84(PJ_CONTEXT* context, PJ* crs) {
+    const Object datum(proj_crs_get_datum_forced(context, crs));
+    const char* code = datum ? proj_get_id_code(datum.get(), 0) : nullptr;
+    return code && std::strcmp(code, "6326") == 0;
+}
+
+}  // namespace
+
+OmbRef<OmbDatumShift> OmbDatumShift::fromInfo(const OmbRef<OmbDatumShiftInfo>& info) {
+    if (!info) OMB_THROW(NullValue, "info", "DatumShift.fromInfo");
+    if (info->authority.toLower() != OmbString::literal("epsg")) unsupported(*info, "not an EPSG code");
+    const Context context(proj_context_create());
+    proj_log_level(context.get(), PJ_LOG_NONE);  // failures become exceptions
+    const std::string code(info->authorityCode);
+    const Object operation(
+        proj_create_from_database(context.get(), "EPSG", code.c_str(), PJ_CATEGORY_COORDINATE_OPERATION, 0, nullptr));
+    if (!operation) unsupported(*info, "not in the catalogue");
+    const char* methodCode = nullptr;
+    proj_coordoperation_get_method_info(context.get(), operation.get(), nullptr, nullptr, &methodCode);
+    const int method = methodCode ? std::atoi(methodCode) : 0;
+    if (!isTranslation(method) && !isPositionVector(method) && !isCoordinateFrame(method))
+        unsupported(*info, "not a Helmert transformation");
+
+    OmbHelmertDatumShift::Parameters p;
+    p.convention = isCoordinateFrame(method) ? OmbRotationSignConvention::CoordinateFrameRotation
+                                             : OmbRotationSignConvention::PositionVectorTransform;
+    const Object source(proj_get_source_crs(context.get(), operation.get()));
+    const Object target(proj_get_target_crs(context.get(), operation.get()));
+    if (target && onWgs84(context.get(), target.get()))
+        p.direction = OmbDatumShiftDirection::ToKnownDatum;
+    else if (source && onWgs84(context.get(), source.get()))
+        p.direction = OmbDatumShiftDirection::FromKnownDatum;
+    else
+        unsupported(*info, "leads to another datum than WGS 84");
+
+    const int count = proj_coordoperation_get_param_count(context.get(), operation.get());
+    for (int i = 0; i < count; ++i) {
+        const char* parameterCode = nullptr;
+        double value = 0, toUnit = 1;
+        proj_coordoperation_get_param(context.get(), operation.get(), i, nullptr, nullptr, &parameterCode, &value,
+                                      nullptr, &toUnit, nullptr, nullptr, nullptr, nullptr);
+        // Metres, radians or the plain scale, by the unit's factor.
+        const double si = value * toUnit;
+        switch (parameterCode ? std::atoi(parameterCode) : 0) {
+            case 8605: p.dx = si; break;
+            case 8606: p.dy = si; break;
+            case 8607: p.dz = si; break;
+            case 8608: p.rx = si * arcSecondsPerRadian; break;
+            case 8609: p.ry = si * arcSecondsPerRadian; break;
+            case 8610: p.rz = si * arcSecondsPerRadian; break;
+            case 8611: p.scaleDifference = si * 1e6; break;
+            default: break;
+        }
+    }
+    OmbRef<OmbHelmertDatumShift> shift(new OmbHelmertDatumShift);
+    shift->parameters(p);
+    shift->name(info->name().empty() ? OmbString(proj_get_name(operation.get())) : info->name());
+    shift->authority(OmbString::literal("epsg"));
+    shift->authorityCode(info->authorityCode);
+    shift->info(info);
+    return OmbRef<OmbDatumShift>(shift);
+}
