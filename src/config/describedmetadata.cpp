@@ -54,10 +54,17 @@ OmbRef<OmbRefCnt> DescribedClassMetaData::createInstance(OmbXmlParserContext& co
                                             OmbString(" is of an incompatible type. "));
         record[i] = value;
     }
-    OmbRef<OmbEngineObject> object(description_.factory()());
-    for (std::size_t i = 0; i < properties.size(); ++i)
-        if (record[i]) properties[i]->set(*object, *record[i]);
-    return OmbRef<OmbRefCnt>(object);
+    // A constructor or setter that refuses a value says so at the element.
+    try {
+        OmbRef<OmbEngineObject> object(description_.factory()());
+        for (std::size_t i = 0; i < properties.size(); ++i)
+            if (record[i]) properties[i]->set(*object, *record[i]);
+        return OmbRef<OmbRefCnt>(object);
+    } catch (const OmbXXmlParserError&) {
+        throw;
+    } catch (const OmbException& e) {
+        OmbXmlParser::fail(element, e.asString());
+    }
 }
 
 DescribedCollectionMetaData::DescribedCollectionMetaData(const OmbClassDescription::CollectionType& type)

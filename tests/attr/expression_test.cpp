@@ -227,7 +227,7 @@ TEST(Condition, ReadsFromConfigurationsAndFailsTheLoadWhenBad) {
                       OmbString("<Configuration Namespace='D'><Condition Expression='1 +'/></Configuration>"), {},
                       OmbDataSetInitialization::Delayed, {});
               }),
-              "Error parsing expression '1 +', position 3: Unexpected token");
+              "Error parsing expression '1 +', position 3: Unexpected token Row 1, Column 30.");
 }
 
 TEST(AttributeUsage, ListsPairsInOrderWithoutMerging) {

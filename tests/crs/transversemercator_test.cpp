@@ -144,6 +144,14 @@ TEST_F(TransverseMercator, UtmZonesAndTheirErrors) {
               "Value \"zone\" is out of range in utm( zone, hemisphere), should be 1, 2, 3, ..., or 60.");
     EXPECT_EQ(errorOf([] { OmbUTM(0); }),
               "Value \"zone\" is out of range in utm( zone, hemisphere), should be 1, 2, 3, ..., or 60.");
+    // Read from a configuration, the error names the element's place.
+    EXPECT_EQ(errorOf([] {
+                  OmbXmlParser::loadString(OmbString("<Configuration Namespace='U'>\n  <UtmProjection Zone='61'/>"
+                                                     "</Configuration>"),
+                                           {}, OmbDataSetInitialization::Delayed, {});
+              }),
+              "Value \"zone\" is out of range in utm( zone, hemisphere), should be 1, 2, 3, ..., or 60. Row 2, "
+              "Column 3.");
 }
 
 TEST_F(TransverseMercator, ReadFromAConfigurationAndSavedAgain) {
