@@ -121,7 +121,24 @@ bool OmbProjection::unproject(const OmbRect& in, const OmbProjCachedNumbers* cac
     const OmbPoint origin = projectedOrigin(cached);
     search.splitX(origin.x);
     search.splitY(origin.y);
-    return search.bounds(in, out);
+    OmbRect found;
+    if (!search.bounds(in, found)) return false;
+    // The inverse is singular at a pole's image: a rectangle around it
+    // reaches the pole and every longitude, inside its edges.
+    for (const double pole : {-90.0, 90.0}) {
+        OmbPoint image(centralLongitude_, pole);
+        if (!isValid(image, cached)) continue;
+        try {
+            project(image, cached);
+        } catch (const OmbException&) {
+            continue;
+        }
+        if (!in.strictlyInside(image)) continue;
+        found.include({-180, pole});
+        found.include({180, pole});
+    }
+    out = found;
+    return true;
 }
 
 void OmbProjection::unproject(OmbPointArray& points, const OmbProjCachedNumbers* cached) const {
