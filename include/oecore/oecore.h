@@ -51,6 +51,7 @@
 #include <oecore/linalg/pointarray.h>
 #include <oecore/linalg/rect.h>
 
+#include <oecore/crs/crs.h>
 #include <oecore/crs/datumshift.h>
 #include <oecore/crs/datumshiftinfo.h>
 #include <oecore/crs/ellipsoid.h>

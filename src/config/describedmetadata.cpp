@@ -59,6 +59,7 @@ OmbRef<OmbRefCnt> DescribedClassMetaData::createInstance(OmbXmlParserContext& co
         OmbRef<OmbEngineObject> object(description_.factory()());
         for (std::size_t i = 0; i < properties.size(); ++i)
             if (record[i]) properties[i]->set(*object, *record[i]);
+        if (description_.afterRead()) description_.afterRead()(*object);
         return OmbRef<OmbRefCnt>(object);
     } catch (const OmbXXmlParserError&) {
         throw;

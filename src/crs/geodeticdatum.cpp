@@ -166,3 +166,22 @@ OmbRef<OmbDatumShiftInfoVec> OmbGeodeticDatum::alternativeDatumShiftsForArea(con
             if (info && info->appliesTo(lola)) found->add(info);
     return found;
 }
+
+namespace {
+
+// Datums compare along their chains of shifts; a chain that loops (which
+// changeDatumTo refuses) stops the comparison as unequal.
+bool sameDatum(const OmbGeodeticDatum& a, const OmbGeodeticDatum& b, int depth) {
+    if (&a == &b) return true;
+    if (depth > 64 || !a.ellipsoid() || !b.ellipsoid() || !a.ellipsoid()->equivalent(*b.ellipsoid())) return false;
+    if (a.primeMeridianDegrees() != b.primeMeridianDegrees()) return false;
+    if (a.isWgs84Equivalent() && b.isWgs84Equivalent()) return true;
+    if (!a.datumShift() || !b.datumShift() || !(*a.datumShift() == *b.datumShift())) return false;
+    const OmbRef<OmbGeodeticDatum>& knownA = a.datumShift()->knownDatum();
+    const OmbRef<OmbGeodeticDatum>& knownB = b.datumShift()->knownDatum();
+    return knownA && knownB && sameDatum(*knownA, *knownB, depth + 1);
+}
+
+}  // namespace
+
+bool OmbGeodeticDatum::operator==(const OmbGeodeticDatum& other) const { return sameDatum(*this, other, 0); }

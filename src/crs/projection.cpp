@@ -87,6 +87,16 @@ double OmbMeriDistProjCachedNumbers::latitudeFromMeridianDistance(double m) cons
     return lat;
 }
 
+bool OmbEarthShapeParameters::sameEarthShape(const OmbEarthShapeParameters& other) const {
+    if (shape_ != other.shape_) return false;
+    if (shape_ == OmbEarthShape::Ellipsoid) return true;
+    const auto effective = [](const OmbString& source) {
+        return source.empty() ? OmbString::literal("#equatorialRadius") : source;
+    };
+    if (effective(sphereRadiusSource_) != effective(other.sphereRadiusSource_)) return false;
+    return sphereRadiusSource_ != OmbString::literal("#radiusFromArgument") || sphereRadius_ == other.sphereRadius_;
+}
+
 // --- the base ---------------------------------------------------------------------
 
 OmbProjection::OmbProjection(bool cyclicX, bool cyclicY) : cyclicX_(cyclicX), cyclicY_(cyclicY) {
@@ -94,7 +104,10 @@ OmbProjection::OmbProjection(bool cyclicX, bool cyclicY) : cyclicX_(cyclicX), cy
 }
 
 const OmbRef<OmbLengthUnit>& OmbProjection::lengthUnit() const {
-    return lengthUnit_ ? lengthUnit_ : OmbLengthUnit::meter();
+    if (lengthUnit_) return lengthUnit_;
+    // The predefined metre, or one of our own while the runtime is down.
+    static const OmbRef<OmbLengthUnit> metre(new OmbLengthUnit(1.0));
+    return OmbLengthUnit::meter() ? OmbLengthUnit::meter() : metre;
 }
 
 OmbProjCachedNumbers* OmbProjection::init(const OmbGeodeticDatum& datum) const {
@@ -285,6 +298,13 @@ bool OmbProjection::sameParameters(const OmbProjection& other) const {
            centralLatitude_ == other.centralLatitude_ && falseEasting_ == other.falseEasting_ &&
            falseNorthing_ == other.falseNorthing_ && scaleFactor_ == other.scaleFactor_ &&
            lengthUnit()->equivalent(*other.lengthUnit());
+}
+
+bool OmbProjection::shiftedByWholeWorlds(const OmbProjection& other, double worldWidth) const {
+    const double offset =
+        (other.falseEasting_ - falseEasting_) - (other.centralLongitude_ - centralLongitude_) * worldWidth / 360;
+    const double turns = offset / worldWidth;
+    return std::fabs(turns - std::round(turns)) * worldWidth <= 1e-5;
 }
 
 void OmbProjection::projectionError(const OmbPoint& p, const char* what) const {

@@ -30,12 +30,12 @@ std::vector<std::string> events;
 void record(const char* what) { events.emplace_back(what); }
 
 int predefinedCreated = 0;
-void createUnits() {
+void createSymbols() {
     ++predefinedCreated;
-    OmbRuntime::registerPredefined(OmbString("Meter"), OmbRef<OmbEngineObject>(new TestNode("m")));
-    OmbRuntime::registerPredefined(OmbString("Foot"), OmbRef<OmbEngineObject>(new TestNode("ft")));
+    OmbRuntime::registerPredefined(OmbString("Circle"), OmbRef<OmbEngineObject>(new TestNode("circle")));
+    OmbRuntime::registerPredefined(OmbString("Square"), OmbRef<OmbEngineObject>(new TestNode("square")));
 }
-void dropUnits() { record("drop units"); }
+void dropSymbols() { record("drop symbols"); }
 
 }  // namespace
 
@@ -43,7 +43,7 @@ TEST_F(RuntimeTest, InitAndShutdownAreIdempotentAndRebuildEverything) {
     OmbRuntime::shutdown();  // without init: nothing happens
     EXPECT_FALSE(OmbRuntime::isInitialized());
 
-    OmbRuntime::registerPredefinedClass(OmbRuntime::PredefinedClass::LengthUnits, createUnits, dropUnits);
+    OmbRuntime::registerPredefinedClass(OmbRuntime::PredefinedClass::Symbols, createSymbols, dropSymbols);
     predefinedCreated = 0;
     OmbRuntime::init();
     OmbRuntime::init();
@@ -52,23 +52,23 @@ TEST_F(RuntimeTest, InitAndShutdownAreIdempotentAndRebuildEverything) {
     EXPECT_TRUE(OmbRuntime::settings());
     EXPECT_TRUE(OmbRuntime::configurationLock());
     OmbRuntime::registerObject(OmbString("app"), OmbRef<OmbEngineObject>(new TestNode));
-    const OmbRef<OmbEngineObject> meter = OmbRuntime::getPredefinedObject(OmbString("Meter"));
-    ASSERT_TRUE(meter);
-    EXPECT_EQ(meter->predefinedName(), OmbString("Meter"));
-    EXPECT_FALSE(OmbRuntime::getPredefinedObject(OmbString("meter")));
+    const OmbRef<OmbEngineObject> circle = OmbRuntime::getPredefinedObject(OmbString("Circle"));
+    ASSERT_TRUE(circle);
+    EXPECT_EQ(circle->predefinedName(), OmbString("Circle"));
+    EXPECT_FALSE(OmbRuntime::getPredefinedObject(OmbString("circle")));
 
     events.clear();
     OmbRuntime::shutdown();
-    EXPECT_EQ(events, (std::vector<std::string>{"drop units"}));
-    EXPECT_FALSE(OmbRuntime::getPredefinedObject(OmbString("Meter")));
+    EXPECT_EQ(events, (std::vector<std::string>{"drop symbols"}));
+    EXPECT_FALSE(OmbRuntime::getPredefinedObject(OmbString("Circle")));
     EXPECT_FALSE(OmbRuntime::getRegisteredObject(OmbString("app")));
     EXPECT_FALSE(OmbRuntime::configurationLock());
     EXPECT_FALSE(OmbRuntime::settings());
 
     OmbRuntime::init();
     EXPECT_EQ(predefinedCreated, 2);
-    EXPECT_TRUE(OmbRuntime::getPredefinedObject(OmbString("Foot")));
-    OmbRuntime::registerPredefinedClass(OmbRuntime::PredefinedClass::LengthUnits, nullptr, nullptr);
+    EXPECT_TRUE(OmbRuntime::getPredefinedObject(OmbString("Square")));
+    OmbRuntime::registerPredefinedClass(OmbRuntime::PredefinedClass::Symbols, nullptr, nullptr);
 }
 
 TEST_F(RuntimeTest, PredefinedNamesAreListedInOrder) {

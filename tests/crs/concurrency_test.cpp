@@ -1,6 +1,7 @@
 // Datums, shifts and projections shared by threads: the caches that shifts
 // build on first use are built once, and every thread sees the same results.
 #include <oecore/core/runtime.h>
+#include <oecore/crs/crs.h>
 #include <oecore/crs/geodeticdatum.h>
 #include <oecore/crs/projections/dynamiclocal.h>
 #include <oecore/crs/projections/projlibprojections.h>
@@ -135,6 +136,37 @@ TEST_F(SharedByThreads, DynamicLocalProjectionMovesWhileInUse) {
     mover.join();
     for (std::thread& t : readers) t.join();
     EXPECT_EQ(mixed, 0);
+}
+
+// One system shared: some threads convert arrays into another system while
+// others measure, which builds the auxiliary constants on first use.
+TEST_F(SharedByThreads, OneSystemConvertsAndMeasuresOnSeveralThreads) {
+    const OmbRef<OmbCrs> utm(new OmbCrs(*OmbCrs::wgs84Utm(32, OmbUTMHemisphere::North)));
+    const OmbCrs& web = *OmbCrs::wgs84MercatorWeb();
+    OmbPointArray source;
+    for (int i = 0; i < 100; ++i) source.push_back({300000.0 + 1000 * i, 5000000.0 + 500 * i});
+    OmbPointArray expected = source;
+    utm->projectTo(web, expected);
+    const double rhumb = OmbCrs(*utm).length2d(source, OmbCrsLineType::RhumbLine, false);
+    std::atomic<bool> go{false};
+    std::atomic<int> differing{0};
+    std::vector<std::thread> threads;
+    for (int t = 0; t < 4; ++t)
+        threads.emplace_back([&, t] {
+            while (!go) std::this_thread::yield();
+            for (int i = 0; i < 20; ++i) {
+                if (t % 2) {
+                    if (utm->length2d(source, OmbCrsLineType::RhumbLine, false) != rhumb) ++differing;
+                    continue;
+                }
+                OmbPointArray points = source;
+                utm->projectTo(web, points);
+                if (!(points == expected)) ++differing;
+            }
+        });
+    go = true;
+    for (std::thread& t : threads) t.join();
+    EXPECT_EQ(differing, 0);
 }
 
 }  // namespace

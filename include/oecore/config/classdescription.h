@@ -130,6 +130,12 @@ public:
     void add(std::unique_ptr<OmbPropertyDescription> property) { own_.push_back(std::move(property)); }
     OmbPropertyDescription& last() { return *own_.back(); }
 
+    // Run by the reader once it has set the properties of an object of
+    // exactly this class, for checks and set-up that need them all.
+    using AfterRead = std::function<void(OmbEngineObject&)>;
+    void afterRead(AfterRead hook) { afterRead_ = std::move(hook); }
+    const AfterRead& afterRead() const noexcept { return afterRead_; }
+
     // The description of cls, or of its nearest described base; null if none.
     static const OmbClassDescription* of(const OmbClass* cls);
     // Every described class, in registration order.
@@ -153,6 +159,7 @@ private:
     std::vector<std::unique_ptr<OmbPropertyDescription>> own_;
     mutable std::vector<const OmbPropertyDescription*> all_;
     mutable bool resolved_ = false;
+    AfterRead afterRead_;
 };
 
 // Walks the description: the engine objects held by object and collection
@@ -356,6 +363,12 @@ public:
         description_.add(std::make_unique<OmbCollectionProperty<T, C>>(
             name, typeName, [getter](const T& o) -> OmbRef<C> { return std::invoke(getter, o); },
             [setter](T& o, const OmbRef<C>& v) { std::invoke(setter, o, v); }));
+        return *this;
+    }
+    // Completes an object once all its properties are read.
+    template <class F>
+    OmbDescriptionBuilder& afterRead(F hook) {
+        description_.afterRead([hook](OmbEngineObject& o) { hook(static_cast<T&>(o)); });
         return *this;
     }
     // Marks the last property as required, or as the element's content.

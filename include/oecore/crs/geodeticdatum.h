@@ -46,6 +46,9 @@ public:
     // Same ellipsoid and meridian as WGS 84, and either EPSG 6326 or a shift
     // to WGS 84 that changes nothing.
     bool isWgs84Equivalent() const;
+    // The same object; or equivalent ellipsoids and meridians with equal
+    // shifts to equal known datums (or both equivalent to WGS 84).
+    bool operator==(const OmbGeodeticDatum& other) const;
 
     // Converts p (long/lat in degrees, height in metres) from this datum to
     // target, walking both to the pivot; OmbXUnconnectedDatums when their

@@ -86,10 +86,9 @@ public:
     double sphereRadiusFor(const OmbProjCachedNumbers& cached, double latitude) const {
         return cached.sphereRadius(sphereRadiusSource_, sphereRadius_, latitude);
     }
-    bool sameEarthShape(const OmbEarthShapeParameters& other) const {
-        return shape_ == other.shape_ && sphereRadius_ == other.sphereRadius_ &&
-               sphereRadiusSource_ == other.sphereRadiusSource_;
-    }
+    // The same shape; for spheres the same radius source (an empty one is
+    // the equatorial radius) and, where it counts, the same radius.
+    bool sameEarthShape(const OmbEarthShapeParameters& other) const;
 
 protected:
     explicit OmbEarthShapeParameters(OmbEarthShape shape) : shape_(shape) {}
@@ -219,6 +218,10 @@ protected:
 
     // The shared parameters, the length unit and the authority agree.
     bool sameParameters(const OmbProjection& other) const;
+    // For cylindrical worlds worldWidth units wide: other's x differ from
+    // this projection's by whole world widths (through central longitude and
+    // false easting), within 1e-5 units.
+    bool shiftedByWholeWorlds(const OmbProjection& other, double worldWidth) const;
     // Raises OmbXProjectionError for a point the formula cannot take.
     [[noreturn]] void projectionError(const OmbPoint& p, const char* what) const;
     // Arcsine for formula arguments that rounding may take just past +-1;

@@ -103,6 +103,12 @@ bool OmbEquidistantCylindrical::equivalent(const OmbProjection& other) const {
     return standardParallel_ == e.standardParallel_ && sameEarthShape(e);
 }
 
+bool OmbEquidistantCylindrical::compatibleWith(const OmbEquidistantCylindrical& other, double worldWidth) const {
+    return shiftedByWholeWorlds(other, worldWidth) && standardParallel_ == other.standardParallel_ &&
+           centralLatitude() == other.centralLatitude() && falseNorthing() == other.falseNorthing() &&
+           sameEarthShape(other) && lengthUnit()->equivalent(*other.lengthUnit());
+}
+
 // --- angular ----------------------------------------------------------------------
 
 const OmbRef<OmbAngleUnit>& OmbEquidistantCylindricalAngularProjection::angleUnit() const {
@@ -132,4 +138,11 @@ bool OmbEquidistantCylindricalAngularProjection::equivalent(const OmbProjection&
     if (!sameParameters(other)) return false;
     const auto& e = static_cast<const OmbEquidistantCylindricalAngularProjection&>(other);
     return standardParallel_ == e.standardParallel_ && angleUnit()->equivalent(*e.angleUnit());
+}
+
+bool OmbEquidistantCylindricalAngularProjection::compatibleWith(const OmbEquidistantCylindricalAngularProjection& other,
+                                                                double worldWidth) const {
+    return shiftedByWholeWorlds(other, worldWidth) && standardParallel_ == other.standardParallel_ &&
+           centralLatitude() == other.centralLatitude() && falseNorthing() == other.falseNorthing() &&
+           angleUnit()->equivalent(*other.angleUnit());
 }

@@ -181,12 +181,7 @@ bool OmbMercator::equivalent(const OmbProjection& other) const {
 }
 
 bool OmbMercator::compatibleWith(const OmbMercator& other, double worldWidth) const {
-    if (myRuntimeClass() != other.myRuntimeClass()) return false;
-    // The two worlds may start at different x, by whole world widths.
-    const double offset =
-        (other.falseEasting() - falseEasting()) - (other.centralLongitude() - centralLongitude()) * worldWidth / 360;
-    const double turns = offset / worldWidth;
-    return std::fabs(turns - std::round(turns)) * worldWidth <= 1e-5 &&
+    return myRuntimeClass() == other.myRuntimeClass() && shiftedByWholeWorlds(other, worldWidth) &&
            std::fabs(scaleFactor() - other.scaleFactor()) <= 1e-9 &&
            std::fabs(standardParallel_ - other.standardParallel_) <= 1e-9 && falseNorthing() == other.falseNorthing() &&
            sameEarthShape(other) && compromiseFactor() == other.compromiseFactor() &&

@@ -26,6 +26,9 @@ public:
     void unproject(OmbPoint& p, const OmbProjCachedNumbers* cached) const override;
     void nominalMetersXY(const OmbProjCachedNumbers* cached, double& mx, double& my) const override;
     bool equivalent(const OmbProjection& other) const override;
+    // Other's coordinates are this projection's moved by whole world widths
+    // (worldWidth in projected units); everything else identical.
+    bool compatibleWith(const OmbEquidistantCylindrical& other, double worldWidth) const;
 
 private:
     double standardParallel_ = 0;
@@ -55,6 +58,8 @@ public:
     // Metres per angle unit along the equator.
     void nominalMetersXY(const OmbProjCachedNumbers* cached, double& mx, double& my) const override;
     bool equivalent(const OmbProjection& other) const override;
+    // As for the metric form.
+    bool compatibleWith(const OmbEquidistantCylindricalAngularProjection& other, double worldWidth) const;
 
 private:
     OmbRef<OmbAngleUnit> angleUnit_;

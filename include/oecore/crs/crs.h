@@ -1,0 +1,211 @@
+// OmbCrs: a coordinate reference system, a projection on a geodetic datum
+// with an optional authority and code ("EPSG" / "4326"). Every conversion
+// between two systems goes through projectTo: unproject with the source's
+// projection, change datum when the datums differ, project with the
+// target's projection.
+//
+// Rectangles that straddle a cyclic target's border: projectTo unprojects
+// the source rectangle into a long/lat box; when that box's longitudes wrap
+// around 180 degrees (the source area crosses the antimeridian), the box
+// becomes the full -180..180 width, so the result covers the area on both
+// sides of the target's border rather than the gap between them.
+//
+// Immutable once constructed and shared between threads. The one write
+// after construction, the auxiliary constants that rhumb-line measurement
+// uses, happens once under a once-flag.
+#pragma once
+
+#include <oecore/attr/atoms.h>
+#include <oecore/crs/datumshiftinfo.h>
+#include <oecore/crs/geodesic.h>
+#include <oecore/crs/projection.h>
+
+#include <memory>
+#include <mutex>
+
+enum class OmbCrsLineType { GreatCircle = 0, GreatCircleApprox = 1, RhumbLine = 2 };
+OMB_DESCRIBE_ENUM(OmbCrsLineType, "CrsLineType", {{"GreatCircle", 0}, {"GreatCircleApprox", 1}, {"RhumbLine", 2}})
+
+class OmbCrs : public OmbResourceObject {
+    OMB_DECLARE_ENGINE_CLASS()
+    OMB_DESCRIBED_MEMBERS()
+
+public:
+    // For the reader, which completes the system once its properties are
+    // read (see construct()).
+    OmbCrs();
+    OmbCrs(const OmbRef<OmbProjection>& projection, const OmbRef<OmbGeodeticDatum>& geodeticDatum);
+    // Authoritative codes: equality may decide on the codes alone.
+    OmbCrs(const OmbString& authority, const OmbString& authorityCode, const OmbRef<OmbProjection>& projection,
+           const OmbRef<OmbGeodeticDatum>& geodeticDatum,
+           OmbDatumShiftChoice choice = OmbDatumShiftChoice::Conservative);
+    // Codes attached as labels next to an explicit projection and datum.
+    OmbCrs(const OmbRef<OmbProjection>& projection, const OmbRef<OmbGeodeticDatum>& geodeticDatum,
+           const OmbString& authority, const OmbString& authorityCode);
+    // A system fitted to a long/lat area (recommendedProjection), in metres.
+    OmbCrs(const OmbPoint& lowerLeft, const OmbPoint& upperRight, const OmbRef<OmbGeodeticDatum>& geodeticDatum);
+    OmbCrs(const OmbCrs& other);
+    ~OmbCrs() override;
+    OmbCrs* clone() const override { return new OmbCrs(*this); }
+
+    // The reader's constructor: with both projection and datum given, the
+    // codes are labels; with neither, they come from fromAuthorityAndCode;
+    // otherwise OmbXCrsNullValue, OmbXCrsNullValues or
+    // OmbXCrsNullValueVariant.
+    void construct();
+
+    const OmbRef<OmbProjection>& projection() const noexcept { return projection_; }
+    const OmbRef<OmbGeodeticDatum>& geodeticDatum() const noexcept { return datum_; }
+    const OmbRef<OmbLengthUnit>& lengthUnit() const { return projection_->lengthUnit(); }
+    const OmbString& authority() const noexcept { return authority_; }
+    const OmbString& authorityCode() const noexcept { return authorityCode_; }
+    bool codeIsLabelOnly() const noexcept { return codeIsLabelOnly_; }
+    // 0 without a code; OmbXCrsIdError for a code that is no number.
+    int id() const;
+    // The projection's constants on this datum, for the projection's calls.
+    const OmbProjCachedNumbers* cachedNumbers() const noexcept { return cached_.get(); }
+    // The long/lat area where the projection is defined, and its projected
+    // bounds.
+    OmbRect getValidArea() const { return projection_->getValidArea(cached_.get()); }
+    OmbRect bounds() const;
+    OmbPoint projectedOrigin() const { return projection_->projectedOrigin(cached_.get()); }
+
+    // For the reader; a system in use does not change.
+    void projection(const OmbRef<OmbProjection>& p) { projection_ = p; }
+    void geodeticDatum(const OmbRef<OmbGeodeticDatum>& d) { datum_ = d; }
+    void authority(const OmbString& a) { authority_ = a; }
+    void authorityCode(const OmbString& c) { authorityCode_ = c; }
+
+    // Long/lat degrees on this datum to projected, and back; z is kept.
+    void project(OmbPoint& p) const { projection_->project(p, cached_.get()); }
+    void project(OmbPointArray& points) const { projection_->project(points, cached_.get()); }
+    void unproject(OmbPoint& p) const { projection_->unproject(p, cached_.get()); }
+    void unproject(OmbPointArray& points) const { projection_->unproject(points, cached_.get()); }
+    // From this system into target: unproject, change datum, project. A
+    // failure leaves the point partly converted.
+    void projectTo(const OmbCrs& target, OmbPoint& p) const;
+    void projectTo(const OmbCrs& target, OmbPointArray& points) const;
+    // The bounds of the rectangle's image in target (see the rule above);
+    // false, with out untouched, when a step fails.
+    bool projectTo(const OmbCrs& target, const OmbRect& in, OmbRect& out) const;
+    // Long/lat on this datum to another datum.
+    void changeDatumTo(const OmbGeodeticDatum& datum, OmbPoint& p) const { datum_->changeDatumTo(datum, p); }
+    void changeDatumTo(const OmbGeodeticDatum& datum, OmbPointArray& points) const {
+        datum_->changeDatumTo(datum, points);
+    }
+    bool isValid(const OmbPoint& lola) const { return projection_->isValid(lola, cached_.get()); }
+    bool isValidProjectedPoint(const OmbPoint& p) const { return projection_->isValidProjectedPoint(p, cached_.get()); }
+    bool continuousValidity(const OmbPoint& lola) const { return projection_->continuousValidity(lola, cached_.get()); }
+
+    // Metres per projected unit at a projected point; false where the point
+    // is not valid. Nominal: independent of position.
+    bool metersXY(const OmbPoint& p, double& mx, double& my) const;
+    double metersX(const OmbPoint& p) const;
+    double metersY(const OmbPoint& p) const;
+    void nominalMetersXY(double& mx, double& my) const { projection_->nominalMetersXY(cached_.get(), mx, my); }
+    double metersFromCrsUnitsNominally(double units) const;
+    double crsUnitsFromMetersNominally(double meters) const;
+    // At a projected point: the plane direction of a ground azimuth, and back
+    // (degrees; see OmbProjection).
+    double angle(const OmbPoint& p, double azimuth) const { return projection_->angle(p, azimuth, cached_.get()); }
+    double azimuth(const OmbPoint& p, double angle) const { return projection_->azimuth(p, angle, cached_.get()); }
+    // Geodesic measurement between projected points, on the datum's
+    // ellipsoid: metres, and azimuths in degrees.
+    double distance(const OmbPoint& a, const OmbPoint& b) const;
+    OmbGeodesicInverse distanceAndAzimuths(const OmbPoint& a, const OmbPoint& b) const;
+    // The projected point at a ground distance and azimuth from p.
+    OmbPoint pointPlusDirectedDistance(const OmbPoint& p, double azimuth, double distance) const;
+    // The length in metres of a projected line (closed: back to the start)
+    // along geodesics or rhumb lines between its points.
+    double length2d(const OmbPointArray& points, OmbCrsLineType lineType, bool closed) const;
+    // The line from a to b (projected) as nodes no more than
+    // maxSegmentLength metres apart along a geodesic or a rhumb line.
+    // GreatCircleApprox raises OmbXGreatCircleApproxRouteNotImplemented.
+    OmbPointArray route(const OmbPoint& a, const OmbPoint& b, OmbCrsLineType lineType, double maxSegmentLength) const;
+    OmbPointArray greatCircleRoute(const OmbPoint& a, const OmbPoint& b, double maxSegmentLength) const {
+        return route(a, b, OmbCrsLineType::GreatCircle, maxSegmentLength);
+    }
+    // Moves a projected rectangle of a cyclic world into the world.
+    void adjustRect(OmbRect& rect) const { projection_->adjustRect(rect, cached_.get()); }
+
+    // Same object; or both with authoritative codes whose atoms agree; or
+    // equal datums and equal projections.
+    bool operator==(const OmbCrs& other) const;
+    bool operator!=(const OmbCrs& other) const { return !(*this == other); }
+    // Equal, or the same cylindrical family on the same datum differing only
+    // by where the world starts in x (rasters and tiles can be shared).
+    bool compatibleWith(const OmbRef<OmbCrs>& other) const;
+
+    // --- factories -------------------------------------------------------------
+    // "crs" codes 84, 83 and 27, the S-JTSK family, and the predefined EPSG
+    // systems; OmbXRangeError for codes outside an authority's ranges,
+    // OmbXUnrecognizedAuthority for another authority.
+    static OmbRef<OmbCrs> fromAuthorityAndCode(const OmbString& authority, const OmbString& code,
+                                               OmbDatumShiftChoice choice = OmbDatumShiftChoice::Conservative);
+    // "EPSG:4326" or "urn:ogc:def:crs:EPSG::4326" (OGC:CRS84 as crs:84).
+    static OmbRef<OmbCrs> fromUrn(const OmbString& urn, OmbDatumShiftChoice choice = OmbDatumShiftChoice::Conservative);
+    // The predefined WGS 84 UTM system of a zone; OmbXRangeError outside
+    // 1..60.
+    static const OmbRef<OmbCrs>& wgs84Utm(int zone, OmbUTMHemisphere hemisphere);
+    // The WGS 84 UTM system whose zone holds the long/lat point.
+    static const OmbRef<OmbCrs>& fromUtmProjectionForPoint(const OmbPoint& lola);
+    // A predefined system by EPSG code; null when there is none.
+    static OmbRef<OmbCrs> findPredefinedInstance(int epsgCode);
+    // A system fitted to a long/lat area (degrees) on the datum.
+    static OmbRef<OmbCrs> fromArea(const OmbPoint& lowerLeft, const OmbPoint& upperRight,
+                                   const OmbRef<OmbGeodeticDatum>& datum);
+    static OmbRef<OmbCrs> createCrsForArea(const OmbPoint& lowerLeft, const OmbPoint& upperRight,
+                                           const OmbRef<OmbGeodeticDatum>& datum) {
+        return fromArea(lowerLeft, upperRight, datum);
+    }
+    // Polar stereographic near the poles, Mercator near the equator,
+    // Lambert conformal conic elsewhere; in metres.
+    static OmbRef<OmbProjection> recommendedProjection(const OmbPoint& lowerLeft, const OmbPoint& upperRight);
+    // This system with its projection moved so that the longitude (on the
+    // projected origin's parallel) projects to (0, 0); named "...Recentered".
+    OmbRef<OmbCrs> recenteredClone(double longitude) const;
+
+    static bool reasonableEpsgCode(int code);
+    static bool reasonableEsriCode(int code);
+    // Longitudes strictly within (-999.5, 999.5), latitudes within
+    // (-90.0000001, 90.0000001).
+    static bool insideValidRange(double value, bool isLongitude);
+
+    // --- predefined systems (while the runtime is initialised) -----------------
+    static const OmbRef<OmbCrs>& wgs84LongLat();
+    static const OmbRef<OmbCrs>& screenCoordinateSystem();
+    static const OmbRef<OmbCrs>& nonGeoreferenced();
+    static const OmbRef<OmbCrs>& SWEREF99TM();
+    static const OmbRef<OmbCrs>& SWEREF99_2_5gonW();
+    static const OmbRef<OmbCrs>& wgs84MercatorEllipsoid();
+    static const OmbRef<OmbCrs>& wgs84MercatorWeb();
+    static const OmbRef<OmbCrs>& wgs84UpsNorth();
+    static const OmbRef<OmbCrs>& wgs84UpsSouth();
+    static const OmbRef<OmbCrs>& etrsLcc();
+    static void createPredefined();
+    static void destroyPredefined();
+
+private:
+    void finish();
+    // The shared auxiliary Mercator's constants on this datum, made once.
+    const OmbProjCachedNumbers& auxMercatorNumbers() const;
+    // Projected to long/lat on this datum; OmbXInvalidOperation for a
+    // system that is not georeferenced.
+    OmbPoint lola(const OmbPoint& p) const;
+    // Metres along the rhumb line between two long/lat points.
+    double rhumbLength(const OmbPoint& from, const OmbPoint& to) const;
+    // A long/lat point's y on the auxiliary Mercator plane (x keeps the
+    // longitude).
+    OmbPoint onMercatorPlane(const OmbPoint& lola) const;
+
+    OmbString authority_;
+    OmbString authorityCode_;
+    OmbAtom authorityAtom_ = 0;
+    OmbAtom codeAtom_ = 0;
+    bool codeIsLabelOnly_ = false;
+    OmbRef<OmbProjection> projection_;
+    OmbRef<OmbGeodeticDatum> datum_;
+    std::unique_ptr<OmbProjCachedNumbers> cached_;
+    mutable std::once_flag auxOnce_;
+    mutable std::unique_ptr<OmbProjCachedNumbers> auxMercator_;
+};

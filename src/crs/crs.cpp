@@ -1,0 +1,397 @@
+#include "projections/projectionmath.h"
+
+#include <oecore/core/exception.h>
+#include <oecore/core/stringbuilder.h>
+#include <oecore/crs/crs.h>
+#include <oecore/crs/projections/azimuthal.h>
+#include <oecore/crs/projections/equidistantcylindrical.h>
+#include <oecore/crs/projections/identity.h>
+#include <oecore/crs/projections/lambertconformalconic.h>
+#include <oecore/crs/projections/mercator.h>
+#include <oecore/crs/projections/wrappedprojections.h>
+
+#include <cmath>
+#include <cstdlib>
+
+using namespace OmbProjectionMath;
+
+OMB_DEFINE_ENGINE_CLASS(OmbCrs, OmbResourceObject, "Crs", 0)
+OMB_DEFINE_DESCRIBED_MEMBERS(OmbCrs)
+
+OMB_DESCRIBE_CLASS(OmbCrs) {
+    d.object<OmbProjection>(
+        "Projection", [](const OmbCrs& c) { return c.projection(); },
+        [](OmbCrs& c, const OmbRef<OmbProjection>& v) { c.projection(v); });
+    d.object<OmbGeodeticDatum>(
+        "GeodeticDatum", [](const OmbCrs& c) { return c.geodeticDatum(); },
+        [](OmbCrs& c, const OmbRef<OmbGeodeticDatum>& v) { c.geodeticDatum(v); });
+    Omb_describeAuthority(d);
+    d.afterRead([](OmbCrs& c) { c.construct(); });
+}
+
+namespace {
+
+OmbString crsName(const OmbCrs& crs) { return crs.name().empty() ? OmbString::literal("Crs") : crs.name(); }
+
+// The x extent of a cylindrical projection's world on its constants.
+double worldWidth(const OmbProjection& projection, const OmbProjCachedNumbers* cached) {
+    OmbPoint centre(projection.centralLongitude(), 0), quarter(projection.centralLongitude() + 90, 0);
+    projection.project(centre, cached);
+    projection.project(quarter, cached);
+    return 4 * std::fabs(quarter.x - centre.x);
+}
+
+}  // namespace
+
+// --- construction -----------------------------------------------------------------
+
+OmbCrs::OmbCrs() = default;
+
+OmbCrs::OmbCrs(const OmbRef<OmbProjection>& projection, const OmbRef<OmbGeodeticDatum>& geodeticDatum)
+    : projection_(projection), datum_(geodeticDatum) {
+    finish();
+}
+
+OmbCrs::OmbCrs(const OmbString& authority, const OmbString& authorityCode, const OmbRef<OmbProjection>& projection,
+               const OmbRef<OmbGeodeticDatum>& geodeticDatum, OmbDatumShiftChoice)
+    : authority_(authority), authorityCode_(authorityCode), projection_(projection), datum_(geodeticDatum) {
+    finish();
+}
+
+OmbCrs::OmbCrs(const OmbRef<OmbProjection>& projection, const OmbRef<OmbGeodeticDatum>& geodeticDatum,
+               const OmbString& authority, const OmbString& authorityCode)
+    : authority_(authority),
+      authorityCode_(authorityCode),
+      codeIsLabelOnly_(true),
+      projection_(projection),
+      datum_(geodeticDatum) {
+    finish();
+}
+
+OmbCrs::OmbCrs(const OmbPoint& lowerLeft, const OmbPoint& upperRight, const OmbRef<OmbGeodeticDatum>& geodeticDatum)
+    : projection_(recommendedProjection(lowerLeft, upperRight)), datum_(geodeticDatum) {
+    finish();
+}
+
+OmbCrs::OmbCrs(const OmbCrs& other)
+    : OmbResourceObject(other),
+      authority_(other.authority_),
+      authorityCode_(other.authorityCode_),
+      codeIsLabelOnly_(other.codeIsLabelOnly_),
+      projection_(other.projection_),
+      datum_(other.datum_) {
+    if (projection_ && datum_) finish();
+}
+
+OmbCrs::~OmbCrs() = default;
+
+void OmbCrs::construct() {
+    const bool hasCode = !authorityCode_.empty();
+    if (projection_ && datum_) {
+        codeIsLabelOnly_ = hasCode;
+    } else if (!projection_ && !datum_) {
+        if (!hasCode) OMB_THROW(CrsNullValues, "projection", "geodeticDatum", crsName(*this));
+        const OmbRef<OmbCrs> catalogued = fromAuthorityAndCode(authority_, authorityCode_);
+        projection_ = catalogued->projection_;
+        datum_ = catalogued->datum_;
+        codeIsLabelOnly_ = false;
+    } else {
+        const char* missing = projection_ ? "geodeticDatum" : "projection";
+        const char* present = projection_ ? "projection" : "geodeticDatum";
+        if (hasCode) OMB_THROW(CrsNullValueVariant, missing, present, crsName(*this));
+        OMB_THROW(CrsNullValue, missing, crsName(*this));
+    }
+    finish();
+}
+
+void OmbCrs::finish() {
+    if (!projection_) OMB_THROW(NullValue, "projection", crsName(*this));
+    if (!datum_) OMB_THROW(NullValue, "geodeticDatum", crsName(*this));
+    authorityAtom_ = authority_.empty() ? 0 : OmbAtoms::atom(authority_.toLower());
+    codeAtom_ = authorityCode_.empty() ? 0 : OmbAtoms::atom(authorityCode_.toLower());
+    cached_.reset(projection_->init(*datum_));
+}
+
+int OmbCrs::id() const {
+    if (authorityCode_.empty() || authorityCode_ == OmbString::literal("0")) return 0;
+    const std::string code(authorityCode_);
+    char* end = nullptr;
+    const long value = std::strtol(code.c_str(), &end, 10);
+    if (end == code.c_str() || *end != '\0' || value <= 0 || value > 0x7fffffff)
+        OMB_THROW(CrsIdError, crsName(*this), authorityCode_);
+    return int(value);
+}
+
+OmbRect OmbCrs::bounds() const {
+    OmbRect out = OmbRect::infinite();
+    projection_->project(getValidArea(), cached_.get(), out);
+    return out;
+}
+
+// --- conversion -------------------------------------------------------------------
+
+void OmbCrs::projectTo(const OmbCrs& target, OmbPoint& p) const {
+    if (&target == this || target == *this) return;
+    unproject(p);
+    if (!(*datum_ == *target.datum_)) datum_->changeDatumTo(*target.datum_, p);
+    target.project(p);
+}
+
+void OmbCrs::projectTo(const OmbCrs& target, OmbPointArray& points) const {
+    if (&target == this || target == *this) return;
+    unproject(points);
+    if (!(*datum_ == *target.datum_)) datum_->changeDatumTo(*target.datum_, points);
+    target.project(points);
+}
+
+bool OmbCrs::projectTo(const OmbCrs& target, const OmbRect& in, OmbRect& out) const {
+    if (&target == this || target == *this) {
+        out = in;
+        return true;
+    }
+    OmbRect lola;
+    try {
+        if (!projection_->unproject(in, cached_.get(), lola)) return false;
+        // A box whose longitudes wrapped covers the whole width.
+        if (lola.xmax - lola.xmin > 180 && projection_->georeferenced() && !in.isEmpty()) {
+            OmbPoint west(in.xmin, (in.ymin + in.ymax) / 2), east(in.xmax, west.y);
+            unproject(west);
+            unproject(east);
+            if (east.x < west.x) lola.xmin = -180, lola.xmax = 180;
+        }
+        if (!lola.clipBy({-180, -90, 180, 90})) return false;
+        OmbRect shifted = lola;
+        if (!(*datum_ == *target.datum_) && !datum_->changeDatumTo(*target.datum_, lola, shifted)) return false;
+        OmbRect projected;
+        if (!target.projection_->project(shifted, target.cached_.get(), projected)) return false;
+        const OmbRect world = target.bounds();
+        if (!world.isInvalid() && !projected.clipBy(world)) return false;
+        out = projected;
+        return true;
+    } catch (const OmbException&) {
+        return false;
+    }
+}
+
+// --- measurement ------------------------------------------------------------------
+
+bool OmbCrs::metersXY(const OmbPoint& p, double& mx, double& my) const {
+    return projection_->metersXY(p, cached_.get(), mx, my);
+}
+
+double OmbCrs::metersX(const OmbPoint& p) const {
+    double mx = 0, my = 0;
+    metersXY(p, mx, my);
+    return mx;
+}
+
+double OmbCrs::metersY(const OmbPoint& p) const {
+    double mx = 0, my = 0;
+    metersXY(p, mx, my);
+    return my;
+}
+
+double OmbCrs::metersFromCrsUnitsNominally(double units) const {
+    double mx, my;
+    nominalMetersXY(mx, my);
+    return units * (mx + my) / 2;
+}
+
+double OmbCrs::crsUnitsFromMetersNominally(double meters) const {
+    double mx, my;
+    nominalMetersXY(mx, my);
+    return meters / ((mx + my) / 2);
+}
+
+OmbPoint OmbCrs::lola(const OmbPoint& p) const {
+    if (!projection_->georeferenced()) OMB_THROW(InvalidOperation, "Crs.distance() with non-georeferenced projection.");
+    OmbPoint q = p;
+    unproject(q);
+    return q;
+}
+
+OmbGeodesicInverse OmbCrs::distanceAndAzimuths(const OmbPoint& a, const OmbPoint& b) const {
+    const OmbEllipsoid& ellipsoid = *datum_->ellipsoid();
+    const OmbPoint from = lola(a), to = lola(b);
+    OmbGeodesicInverse g = Omb_distanceAndAzimuthsVincenty(ellipsoid, from, to);
+    return g.converged ? g : Omb_distanceAndAzimuthsExact(ellipsoid, from, to);
+}
+
+double OmbCrs::distance(const OmbPoint& a, const OmbPoint& b) const { return distanceAndAzimuths(a, b).distance; }
+
+OmbPoint OmbCrs::pointPlusDirectedDistance(const OmbPoint& p, double azimuth, double distance) const {
+    OmbPoint q = Omb_pointPlusDirectedDistance(*datum_->ellipsoid(), lola(p), azimuth, distance);
+    project(q);
+    return q;
+}
+
+const OmbProjCachedNumbers& OmbCrs::auxMercatorNumbers() const {
+    std::call_once(auxOnce_, [this] {
+        const OmbRef<OmbProjection>& mercator = OmbProjection::mercator1SPEllipsoid();
+        auxMercator_.reset(mercator->init(*datum_));
+    });
+    return *auxMercator_;
+}
+
+OmbPoint OmbCrs::onMercatorPlane(const OmbPoint& lola) const {
+    OmbPoint p(0, lola.y);
+    OmbProjection::mercator1SPEllipsoid()->project(p, &auxMercatorNumbers());
+    return {lola.x, p.y};
+}
+
+double OmbCrs::rhumbLength(const OmbPoint& from, const OmbPoint& to) const {
+    // Straight on the Mercator plane: the meridian arc between the
+    // latitudes over the cosine of the course, or the parallel's arc.
+    const double dLon = wrapLongitude(to.x - from.x);
+    OmbPoint degree(1, 0);
+    OmbProjection::mercator1SPEllipsoid()->project(degree, &auxMercatorNumbers());
+    const double course = std::atan2(dLon * degree.x, onMercatorPlane(to).y - onMercatorPlane(from).y);
+    const OmbMeriDistProjCachedNumbers arcs(*datum_, 1, 0);
+    const double lat1 = from.y * radiansPerDegree, lat2 = to.y * radiansPerDegree;
+    if (std::fabs(lat2 - lat1) < 1e-12)
+        return std::fabs(dLon) * radiansPerDegree * arcs.primeVerticalRadius(std::sin(lat1)) * std::cos(lat1);
+    return std::fabs((arcs.meridianDistance(lat2) - arcs.meridianDistance(lat1)) / std::cos(course));
+}
+
+double OmbCrs::length2d(const OmbPointArray& points, OmbCrsLineType lineType, bool closed) const {
+    double length = 0;
+    const std::size_t n = points.size();
+    for (std::size_t i = 0; n > 1 && i < (closed ? n : n - 1); ++i) {
+        const OmbPoint& a = points[i];
+        const OmbPoint& b = points[(i + 1) % n];
+        length += lineType == OmbCrsLineType::RhumbLine ? rhumbLength(lola(a), lola(b)) : distance(a, b);
+    }
+    return length;
+}
+
+OmbPointArray OmbCrs::route(const OmbPoint& a, const OmbPoint& b, OmbCrsLineType lineType,
+                            double maxSegmentLength) const {
+    if (lineType == OmbCrsLineType::GreatCircleApprox) OMB_THROW(GreatCircleApproxRouteNotImplemented, crsName(*this));
+    OmbPointArray nodes;
+    if (lineType == OmbCrsLineType::GreatCircle) {
+        nodes = Omb_geodesicRoute(*datum_->ellipsoid(), lola(a), lola(b), maxSegmentLength);
+    } else {
+        // Equal steps along the straight line on the Mercator plane, the
+        // shorter way round in longitude.
+        const OmbPoint from = lola(a), to = lola(b);
+        const double length = rhumbLength(from, to);
+        if (!(maxSegmentLength > 0) || !(length / maxSegmentLength < 1e6))
+            OMB_THROW(Argument, "route (maxSegmentLength must be positive)");
+        const std::size_t segments = std::max<std::size_t>(1, std::size_t(std::ceil(length / maxSegmentLength)));
+        const double dLon = wrapLongitude(to.x - from.x);
+        const double y1 = onMercatorPlane(from).y, y2 = onMercatorPlane(to).y;
+        for (std::size_t k = 0; k <= segments; ++k) {
+            const double t = double(k) / double(segments);
+            OmbPoint node(0, y1 + t * (y2 - y1), from.z + t * (to.z - from.z));
+            OmbProjection::mercator1SPEllipsoid()->unproject(node, &auxMercatorNumbers());
+            node.x = wrapLongitude(from.x + t * dLon);
+            nodes.push_back(node);
+        }
+    }
+    project(nodes);
+    nodes[0] = a, nodes[nodes.size() - 1] = b;
+    return nodes;
+}
+
+// --- comparison -------------------------------------------------------------------
+
+bool OmbCrs::operator==(const OmbCrs& other) const {
+    if (this == &other) return true;
+    if (!codeIsLabelOnly_ && !other.codeIsLabelOnly_ && authorityAtom_ && codeAtom_ &&
+        authorityAtom_ == other.authorityAtom_ && codeAtom_ == other.codeAtom_)
+        return true;
+    return *datum_ == *other.datum_ && *projection_ == *other.projection_;
+}
+
+bool OmbCrs::compatibleWith(const OmbRef<OmbCrs>& other) const {
+    if (!other) return false;
+    if (*this == *other) return true;
+    if (!(*datum_ == *other->datum_)) return false;
+    const double width = worldWidth(*other->projection_, other->cached_.get());
+    if (const auto* m = dynamic_cast<const OmbMercator*>(projection_.get()))
+        if (const auto* n = dynamic_cast<const OmbMercator*>(other->projection_.get()))
+            return m->compatibleWith(*n, width);
+    if (const auto* e = dynamic_cast<const OmbEquidistantCylindrical*>(projection_.get()))
+        if (const auto* f = dynamic_cast<const OmbEquidistantCylindrical*>(other->projection_.get()))
+            return e->compatibleWith(*f, width);
+    // Long/lat counts as the angular family in degrees.
+    const auto angular = [](const OmbRef<OmbProjection>& p) -> OmbRef<OmbEquidistantCylindricalAngularProjection> {
+        if (dynamic_cast<const OmbLoLa*>(p.get()))
+            return OmbRef<OmbEquidistantCylindricalAngularProjection>(new OmbEquidistantCylindricalAngularProjection);
+        return omb_dynamic_cast<OmbEquidistantCylindricalAngularProjection>(p);
+    };
+    const auto a = angular(projection_), b = angular(other->projection_);
+    return a && b && a->compatibleWith(*b, width);
+}
+
+// --- factories --------------------------------------------------------------------
+
+bool OmbCrs::reasonableEpsgCode(int code) {
+    return (code >= 2000 && code <= 5999) || (code >= 7000 && code <= 7999) || (code >= 20000 && code <= 32767);
+}
+
+bool OmbCrs::reasonableEsriCode(int code) {
+    return (code >= 37000 && code <= 37999) || (code >= 53000 && code <= 54999) || (code >= 65000 && code <= 65999) ||
+           (code >= 102000 && code <= 104999);
+}
+
+bool OmbCrs::insideValidRange(double value, bool isLongitude) {
+    return isLongitude ? value > -999.5 && value < 999.5 : value > -90.0000001 && value < 90.0000001;
+}
+
+OmbRef<OmbCrs> OmbCrs::fromUrn(const OmbString& urn, OmbDatumShiftChoice choice) {
+    std::vector<std::string> parts;
+    const std::string text(urn);
+    for (std::size_t start = 0;;) {
+        const std::size_t colon = text.find(':', start);
+        parts.push_back(text.substr(start, colon - start));
+        if (colon == std::string::npos) break;
+        start = colon + 1;
+    }
+    std::string authority, code;
+    if (parts.size() == 2) {
+        authority = parts[0], code = parts[1];
+    } else if (parts.size() >= 6) {
+        authority = parts[4], code = parts.back();
+        if (OmbString(authority).toLower() == OmbString::literal("ogc") && code.size() >= 3 &&
+            OmbString(code.substr(0, 3)).toLower() == OmbString::literal("crs"))
+            authority = "CRS", code = code.substr(3);
+    } else {
+        OMB_THROW(Argument, "Crs.fromUrn (\"" + urn + "\" is neither AUTHORITY:CODE nor an OGC URN)");
+    }
+    return fromAuthorityAndCode(OmbString(authority), OmbString(code), choice);
+}
+
+OmbRef<OmbProjection> OmbCrs::recommendedProjection(const OmbPoint& lowerLeft, const OmbPoint& upperRight) {
+    const double west = lowerLeft.x, east = upperRight.x, south = lowerLeft.y, north = upperRight.y;
+    double centreLongitude = (west + east + (east < west ? 360 : 0)) / 2;
+    while (centreLongitude > 180) centreLongitude -= 360;
+    while (centreLongitude < -180) centreLongitude += 360;
+    const double centreLatitude = (south + north) / 2;
+    if (centreLatitude >= 85 || north >= 90 || centreLatitude <= -85 || south <= -90) {
+        OmbRef<OmbPolarStereographic> polar(new OmbPolarStereographic(centreLatitude > 0));
+        polar->centralLongitude(centreLongitude);
+        return OmbRef<OmbProjection>(polar);
+    }
+    if (std::fabs(centreLatitude) < 5) {
+        OmbRef<OmbMercator> mercator(new OmbMercator);
+        mercator->shape(OmbEarthShape::Ellipsoid);
+        mercator->centralLongitude(centreLongitude);
+        return OmbRef<OmbProjection>(mercator);
+    }
+    return OmbRef<OmbProjection>(new OmbLambertConformalConic2SP(centreLongitude, centreLatitude,
+                                                                 (3 * south + north) / 4, (3 * north + south) / 4));
+}
+
+OmbRef<OmbCrs> OmbCrs::fromArea(const OmbPoint& lowerLeft, const OmbPoint& upperRight,
+                                const OmbRef<OmbGeodeticDatum>& datum) {
+    return OmbRef<OmbCrs>(new OmbCrs(lowerLeft, upperRight, datum));
+}
+
+OmbRef<OmbCrs> OmbCrs::recenteredClone(double longitude) const {
+    const OmbPoint origin(longitude, projection_->centralLatitude());
+    OmbRef<OmbCrs> clone(
+        new OmbCrs(OmbRef<OmbProjection>(new OmbProjectionWithNewOrigin(projection_, origin)), datum_));
+    clone->name(name() + OmbString::literal("Recentered"));
+    return clone;
+}

@@ -1,0 +1,281 @@
+#include <oecore/config/configuration.h>
+#include <oecore/core/exception.h>
+#include <oecore/crs/crs.h>
+#include <oecore/crs/projections/azimuthal.h>
+#include <oecore/crs/projections/equidistantcylindrical.h>
+#include <oecore/crs/projections/lambertconformalconic.h>
+#include <oecore/crs/projections/mercator.h>
+#include <oecore/crs/projections/transversemercator.h>
+
+#include <gtest/gtest.h>
+
+#include <sstream>
+
+#include "../errortext.h"
+#include "../runtimescope.h"
+#include "projectiontest.h"
+#include "referencetool.h"
+
+namespace {
+
+class Crs : public RuntimeScope {};
+
+OmbRef<OmbGeodeticDatum> osgb36() {
+    OmbHelmertDatumShift::Parameters p;
+    p.dx = 446.448, p.dy = -125.157, p.dz = 542.06, p.rx = 0.15, p.ry = 0.247, p.rz = 0.842;
+    p.scaleDifference = -20.489;
+    OmbRef<OmbHelmertDatumShift> shift(new OmbHelmertDatumShift);
+    shift->parameters(p);
+    return OmbRef<OmbGeodeticDatum>(
+        new OmbGeodeticDatum(OmbEllipsoid::airy1830(), OmbPrimeMeridian::greenwich(), shift));
+}
+
+OmbRef<OmbCrs> britishNationalGrid() {
+    return OmbRef<OmbCrs>(
+        new OmbCrs(OmbRef<OmbProjection>(new OmbTransverseMercator(-2, 49, 400000, -100000, 0.9996012717)), osgb36()));
+}
+
+std::string rangeErrorOf(const char* authority, const char* code) {
+    return errorOf([&] { OmbCrs::fromAuthorityAndCode(OmbString(authority), OmbString(code)); });
+}
+
+}  // namespace
+
+TEST_F(Crs, PredefinedSystemsAndTheirCodes) {
+    EXPECT_EQ(OmbRuntime::getPredefinedObject(OmbString("Crs.Wgs84LongLat")).get(), OmbCrs::wgs84LongLat().get());
+    EXPECT_EQ(OmbCrs::wgs84LongLat()->authorityCode(), OmbString("4326"));
+    const OmbRef<OmbCrs>& utm = OmbCrs::wgs84Utm(33, OmbUTMHemisphere::South);
+    EXPECT_EQ(utm->name(), OmbString("Wgs84Utm33S"));
+    EXPECT_EQ(utm->id(), 32733);
+    EXPECT_EQ(OmbRuntime::getPredefinedObject(OmbString("Crs.Wgs84Utm33S")).get(), utm.get());
+    EXPECT_EQ(OmbCrs::findPredefinedInstance(32661).get(), OmbCrs::findPredefinedInstance(5041).get());
+    EXPECT_EQ(OmbCrs::findPredefinedInstance(5041).get(), OmbCrs::wgs84UpsNorth().get());
+    EXPECT_FALSE(OmbCrs::findPredefinedInstance(32700));
+    EXPECT_EQ(OmbCrs::findPredefinedInstance(3006).get(), OmbCrs::SWEREF99TM().get());
+    EXPECT_FALSE(OmbRuntime::getPredefinedObject(OmbString("Crs.SWEREF99TM")));
+    EXPECT_EQ(OmbCrs::fromUtmProjectionForPoint({-3, 40}).get(), OmbCrs::wgs84Utm(30, OmbUTMHemisphere::North).get());
+    EXPECT_EQ(OmbCrs::nonGeoreferenced()->authorityCode(), OmbString("51003"));
+    EXPECT_FALSE(OmbCrs::screenCoordinateSystem()->projection()->georeferenced());
+    EXPECT_EQ(errorOf([] { OmbCrs::wgs84Utm(0, OmbUTMHemisphere::North); }),
+              "Value \"zone\" is out of range in wgs84Utm( zone, hemisphere), should be 1, 2, 3, ..., or 60.");
+}
+
+TEST_F(Crs, EqualityCodesAndIds) {
+    const auto tm = OmbProjection::utm(33, OmbUTMHemisphere::North);
+    const auto wgs84 = OmbGeodeticDatum::wgs84();
+    // Different codes, same datum and projection: equal.
+    const OmbCrs a(OmbString("epsg"), OmbString("32633"), tm, wgs84),
+        b(OmbString("epsg"), OmbString("3006"), tm, wgs84);
+    EXPECT_TRUE(a == b);
+    // Equal authoritative codes decide alone; labels never do.
+    const OmbCrs c(OmbString("EPSG"), OmbString("32633"), OmbProjection::mercator1SPWeb(), wgs84);
+    EXPECT_TRUE(a == c);
+    const OmbCrs labelled(OmbProjection::mercator1SPWeb(), wgs84, OmbString("epsg"), OmbString("32633"));
+    EXPECT_FALSE(a == labelled);
+    EXPECT_TRUE(a != OmbCrs(OmbProjection::mercator1SPWeb(), osgb36()));
+    EXPECT_EQ(OmbCrs(tm, wgs84).id(), 0);
+    EXPECT_EQ(OmbCrs(OmbString("epsg"), OmbString("0"), tm, wgs84).id(), 0);
+    OmbCrs named(OmbString("epsg"), OmbString("x1"), tm, wgs84);
+    named.name(OmbString("Odd"));
+    EXPECT_EQ(errorOf([&] { named.id(); }),
+              "The id of Crs Odd cannot be extracted, because the authorityCode was x1 but should have been in the "
+              "range epsg:1024 to epsg:32767.");
+    EXPECT_EQ(errorOf([&] { OmbCrs(OmbRef<OmbProjection>(), wgs84); }), "Value \"projection\" is null in Crs.");
+}
+
+TEST_F(Crs, AuthoritiesCodesAndUrns) {
+    const char* epsgRange =
+        "Value \"authorityCode\" is out of range in Crs.FromAuthorityAndCode( epsg, authorityCode), "
+        "should be between 2000 and 5999 or between 7000 and 7999 or between 20000 and 32767..";
+    EXPECT_EQ(rangeErrorOf("epsg", "1999"), epsgRange);
+    EXPECT_EQ(rangeErrorOf("EPSG", "6000"), epsgRange);
+    for (const char* code : {"2000", "5999", "7000", "32767"}) EXPECT_NE(rangeErrorOf("epsg", code), epsgRange);
+    EXPECT_EQ(OmbCrs::fromAuthorityAndCode(OmbString("epsg"), OmbString("32633")).get(),
+              OmbCrs::wgs84Utm(33, OmbUTMHemisphere::North).get());
+    EXPECT_EQ(OmbCrs::fromAuthorityAndCode(OmbString("crs"), OmbString("84"))->name(), OmbString("Crs84LongLat"));
+    EXPECT_TRUE(*OmbCrs::fromAuthorityAndCode(OmbString("CRS"), OmbString("83")) == *OmbCrs::wgs84LongLat());
+    EXPECT_EQ(rangeErrorOf("crs", "27"),
+              "Cannot construct the OGC coordinate system Crs:27 (NAD27 with Long before Lat) because no datum shift "
+              "for NAD27 was given, and Ombravel does not know any generally useful datum shift. (You would get a "
+              "datum shift for Contiguous U.S. if you had used DatumShiftChoice = Lenient.)");
+    const auto nad27 = OmbCrs::fromAuthorityAndCode(OmbString("crs"), OmbString("27"), OmbDatumShiftChoice::Lenient);
+    EXPECT_EQ(nad27->geodeticDatum()->datumShift()->info()->authorityCode, OmbString("51048"));
+    EXPECT_TRUE(nad27->geodeticDatum()->ellipsoid()->equivalent(*OmbEllipsoid::clarke1866()));
+    EXPECT_EQ(rangeErrorOf("crs", "99"),
+              "Value \"authorityCode\" is out of range in Crs.FromAuthorityAndCode( \"crs\", authorityCode), should "
+              "be 27, 83 or 84..");
+    EXPECT_EQ(rangeErrorOf("iau", "1"),
+              "Cannot construct Crs iau:1, because the authority iau is not recognized (only EPSG, CRS and ESRI are "
+              "supported).");
+    EXPECT_EQ(OmbCrs::fromUrn(OmbString("EPSG:4326")).get(), OmbCrs::wgs84LongLat().get());
+    EXPECT_EQ(OmbCrs::fromUrn(OmbString("urn:ogc:def:crs:EPSG::3857")).get(), OmbCrs::wgs84MercatorWeb().get());
+    EXPECT_EQ(OmbCrs::fromUrn(OmbString("urn:ogc:def:crs:OGC:1.3:CRS84"))->authorityCode(), OmbString("84"));
+}
+
+TEST_F(Crs, ProjectToAgreesWithProjAcrossDatums) {
+    const auto grid = britishNationalGrid();
+    const OmbCrs& utm30 = *OmbCrs::wgs84Utm(30, OmbUTMHemisphere::North);
+    const auto points = randomPoints(277, 500, -6, 2, 50, 58);
+    std::vector<OmbPoint> gridPoints;
+    for (OmbPoint p : points) grid->project(p), gridPoints.push_back(p);
+    const auto expected = cs2cs(
+        "+proj=tmerc +lat_0=49 +lon_0=-2 +k_0=0.9996012717 +x_0=400000 +y_0=-100000 +ellps=airy "
+        "+towgs84=446.448,-125.157,542.06,0.15,0.247,0.842,-20.489",
+        "+proj=utm +zone=30 +datum=WGS84", gridPoints);
+    ASSERT_EQ(expected.size(), points.size()) << "cs2cs (proj-bin) is needed";
+    OmbPointArray array(gridPoints.size());
+    for (std::size_t i = 0; i < gridPoints.size(); ++i) array[i] = gridPoints[i];
+    grid->projectTo(utm30, array);
+    for (std::size_t i = 0; i < gridPoints.size(); ++i) {
+        OmbPoint p = gridPoints[i];
+        grid->projectTo(utm30, p);
+        EXPECT_LT(p.distanceTo(expected[i]), 0.001);
+        EXPECT_EQ(array[i], p);
+    }
+    // A system converts nothing into itself, even outside its domain.
+    OmbPoint outside(1e30, -1e30);
+    grid->projectTo(*grid, outside);
+    EXPECT_EQ(outside, OmbPoint(1e30, -1e30));
+}
+
+TEST_F(Crs, RectanglesCoverTheirImagesAndWrapAtTheTargetsBorder) {
+    const auto grid = britishNationalGrid();
+    const OmbCrs& web = *OmbCrs::wgs84MercatorWeb();
+    const OmbRect in(100000, 50000, 600000, 900000);
+    OmbRect out;
+    ASSERT_TRUE(grid->projectTo(web, in, out));
+    for (const OmbPoint& p : randomPoints(5, 1000, in.xmin, in.xmax, in.ymin, in.ymax)) {
+        OmbPoint q = p;
+        grid->projectTo(web, q);
+        EXPECT_TRUE(out.inside(q));
+    }
+    // A UTM rectangle across 180 degrees covers both ends of the long/lat
+    // world rather than the gap between them.
+    const OmbCrs& zone60 = *OmbCrs::wgs84Utm(60, OmbUTMHemisphere::North);
+    OmbPoint west(178, 50), east(-178, 51);
+    zone60.project(west);
+    zone60.project(east);
+    OmbRect lola;
+    ASSERT_TRUE(zone60.projectTo(*OmbCrs::wgs84LongLat(), OmbRect(west.x, west.y, east.x, east.y), lola));
+    EXPECT_EQ(lola.xmin, -180);
+    EXPECT_EQ(lola.xmax, 180);
+    EXPECT_GT(lola.ymin, 49.5);
+    EXPECT_LT(lola.ymax, 51.5);
+}
+
+TEST_F(Crs, AreasGetAFittingProjection) {
+    const auto across = OmbCrs::recommendedProjection({170, 40}, {-170, 50});
+    EXPECT_TRUE(omb_dynamic_cast<OmbLambertConformalConic2SP>(across));
+    EXPECT_EQ(across->centralLongitude(), 180);
+    const auto lcc = omb_dynamic_cast<OmbLambertConformalConic2SP>(across);
+    EXPECT_EQ(lcc->standardParallel1(), 42.5);
+    EXPECT_EQ(lcc->standardParallel2(), 47.5);
+    EXPECT_TRUE(omb_dynamic_cast<OmbMercator>(OmbCrs::recommendedProjection({-10, -4}, {10, 4})));
+    const auto north = omb_dynamic_cast<OmbPolarStereographic>(OmbCrs::recommendedProjection({0, 80}, {10, 90}));
+    ASSERT_TRUE(north);
+    EXPECT_TRUE(north->northPole());
+    EXPECT_FALSE(
+        omb_dynamic_cast<OmbPolarStereographic>(OmbCrs::recommendedProjection({0, -90}, {10, -80}))->northPole());
+    const auto fitted = OmbCrs::fromArea({5, 55}, {25, 70}, OmbGeodeticDatum::wgs84());
+    OmbPoint centre(15, 62.5);
+    fitted->project(centre);
+    EXPECT_NEAR(centre.x, 0, 1e-6);
+    EXPECT_NEAR(centre.y, 0, 1e-6);
+}
+
+TEST_F(Crs, MeasuresOnTheEllipsoid) {
+    const OmbCrs& utm = *OmbCrs::wgs84Utm(32, OmbUTMHemisphere::North);
+    OmbPoint a(9, 48), b(11.5, 53.3);
+    utm.project(a);
+    utm.project(b);
+    const auto exact = runReferenceTool("GeodSolve -i -p 6", {"48 9 53.3 11.5"});
+    ASSERT_EQ(exact.size(), 1u) << "GeodSolve (geographiclib-tools) is needed";
+    double azimuth1, azimuth2, metres;
+    std::istringstream(exact[0]) >> azimuth1 >> azimuth2 >> metres;
+    EXPECT_NEAR(utm.distance(a, b), metres, 1e-3);
+    EXPECT_NEAR(utm.distanceAndAzimuths(a, b).azimuth, azimuth1, 1e-7);
+    EXPECT_TRUE(utm.pointPlusDirectedDistance(a, azimuth1, metres).approxEqual(b, 1e-3));
+    EXPECT_NEAR(utm.length2d(OmbPointArray{a, b, a}, OmbCrsLineType::GreatCircle, false), 2 * metres, 2e-3);
+
+    // Rhumb lines: along the equator a degree is a / 180 * pi; along a
+    // meridian the meridian arc; the route keeps one course.
+    const OmbCrs& lola = *OmbCrs::wgs84LongLat();
+    EXPECT_NEAR(lola.length2d(OmbPointArray{{0, 0}, {1, 0}}, OmbCrsLineType::RhumbLine, false), 6378137 * M_PI / 180,
+                1e-6);
+    EXPECT_NEAR(lola.length2d(OmbPointArray{{0, 0}, {0, 1}, {0, 0}}, OmbCrsLineType::RhumbLine, true),
+                2 * 110574.3885578, 1e-3);
+    const OmbPointArray rhumb = lola.route({-74, 40.7}, {-9.1, 38.7}, OmbCrsLineType::RhumbLine, 100000);
+    ASSERT_GT(rhumb.size(), 50u);
+    const OmbCrs& mercator = *OmbCrs::wgs84MercatorEllipsoid();
+    OmbPointArray plane = rhumb;
+    lola.projectTo(mercator, plane);
+    const OmbPoint direction = plane.back() - plane.front();
+    for (const OmbPoint& p : plane) EXPECT_NEAR((p - plane.front()).cross(direction).z / direction.length2(), 0, 1e-3);
+    EXPECT_EQ(errorOf([&] {
+                  lola.route({0, 0}, {1, 1}, OmbCrsLineType::GreatCircleApprox, 1000);
+              }),
+              "Please adjust the GreatCircleNodeErrorMax instead, because Wgs84LongLat.Route() with lineType = "
+              "GreatCircleApprox is not implemented");
+    EXPECT_EQ(errorOf([] {
+                  OmbCrs::nonGeoreferenced()->distance({0, 0}, {1, 1});
+              }),
+              "Crs.distance() with non-georeferenced projection.");
+}
+
+TEST_F(Crs, CompatibleSystemsDifferByWholeWorlds) {
+    const auto wgs84 = OmbGeodeticDatum::wgs84();
+    OmbRef<OmbMercator> shifted(new OmbMercator);
+    shifted->centralLongitude(90);
+    shifted->falseEasting(2 * M_PI * 6378137 / 4);
+    const OmbRef<OmbCrs> web = OmbCrs::wgs84MercatorWeb();
+    EXPECT_TRUE(web->compatibleWith(OmbRef<OmbCrs>(new OmbCrs(OmbRef<OmbProjection>(shifted), wgs84))));
+    shifted->falseEasting(0);
+    EXPECT_FALSE(web->compatibleWith(OmbRef<OmbCrs>(new OmbCrs(OmbRef<OmbProjection>(shifted), wgs84))));
+    // Long/lat counts as the angular equidistant cylindrical in degrees.
+    OmbRef<OmbEquidistantCylindricalAngularProjection> plate(new OmbEquidistantCylindricalAngularProjection);
+    plate->centralLongitude(180);
+    plate->falseEasting(180);
+    EXPECT_TRUE(
+        OmbCrs::wgs84LongLat()->compatibleWith(OmbRef<OmbCrs>(new OmbCrs(OmbRef<OmbProjection>(plate), wgs84))));
+    EXPECT_FALSE(
+        OmbCrs::wgs84LongLat()->compatibleWith(OmbRef<OmbCrs>(new OmbCrs(OmbProjection::longLat(), osgb36()))));
+    EXPECT_FALSE(web->compatibleWith(OmbCrs::wgs84Utm(1, OmbUTMHemisphere::North)));
+}
+
+TEST_F(Crs, ReadFromConfigurations) {
+    const auto c = OmbXmlParser::loadString(
+        OmbString("<Configuration Namespace='C'>"
+                  "<Crs Name='utm' Public='true' Authority='epsg' AuthorityCode='32632'/>"
+                  "<Crs Name='web' Public='true' Projection='{ResourceReference Predefined=true, "
+                  "Value=Projections.mercator1SP_web}' GeodeticDatum='{ResourceReference Predefined=true, "
+                  "Value=Datums.Wgs84}' Authority='epsg' AuthorityCode='3857'/>"
+                  "</Configuration>"),
+        {}, OmbDataSetInitialization::Delayed, {});
+    const auto utm = omb_dynamic_cast<OmbCrs>(c->getPublicObject(OmbString("utm")));
+    ASSERT_TRUE(utm);
+    EXPECT_TRUE(*utm == *OmbCrs::wgs84Utm(32, OmbUTMHemisphere::North));
+    EXPECT_FALSE(utm->codeIsLabelOnly());
+    const auto web = omb_dynamic_cast<OmbCrs>(c->getPublicObject(OmbString("web")));
+    ASSERT_TRUE(web);
+    EXPECT_TRUE(web->codeIsLabelOnly());
+    EXPECT_TRUE(*web == *OmbCrs::wgs84MercatorWeb());
+    const auto again = OmbXmlParser::loadString(web->save(), {}, OmbDataSetInitialization::Delayed, {});
+    EXPECT_TRUE(*omb_dynamic_cast<OmbCrs>(again->getPublicObject(OmbString("web"))) == *web);
+
+    const auto failing = [](const char* element) {
+        return errorOf([&] {
+            OmbXmlParser::loadString(
+                OmbString("<Configuration Namespace='C'>") + OmbString(element) + OmbString("</Configuration>"), {},
+                OmbDataSetInitialization::Delayed, {});
+        });
+    };
+    EXPECT_EQ(failing("<Crs Name='n'/>"),
+              "n: Values \"projection\" and \"geodeticDatum\" are both null in n, and "
+              "automatic extraction from authorityCode failed. Row 1, Column 30.");
+    EXPECT_EQ(failing("<Crs Name='n' Projection='{ResourceReference Predefined=true, Value=Projections.LongLat}'/>"),
+              "n: Value \"geodeticDatum\" is null in n, and authorityCode is not given. Row 1, Column 30.");
+    EXPECT_EQ(failing("<Crs Name='n' Authority='epsg' AuthorityCode='4326' Projection='{ResourceReference "
+                      "Predefined=true, Value=Projections.LongLat}'/>"),
+              "n: In Crs n, value \"geodeticDatum\" is null but value \"projection\" is not, and automatic "
+              "extraction from authorityCode requires both to be null. Row 1, Column 30.");
+}
