@@ -12,6 +12,7 @@ packages=(
   clang libfuzzer-14-dev libclang-rt-14-dev
   geographiclib-tools proj-bin libproj-dev
   libnewmat10-dev
+  libgdal-dev gdal-bin
 )
 
 missing=()

@@ -1,4 +1,6 @@
 // The predefined coordinate systems and the factories that find them.
+#include "crscatalogue.h"
+
 #include <oecore/core/exception.h>
 #include <oecore/core/runtime.h>
 #include <oecore/core/stringbuilder.h>
@@ -151,7 +153,7 @@ OmbRef<OmbCrs> OmbCrs::fromAuthorityAndCode(const OmbString& authority, const Om
             OMB_THROW(RangeError, "authorityCode", "Crs.FromAuthorityAndCode( epsg, authorityCode)",
                       "between 2000 and 5999 or between 7000 and 7999 or between 20000 and 32767.");
         if (OmbRef<OmbCrs> known = findPredefinedInstance(number)) return known;
-        OMB_THROW(EpsgCrsCodeNotFound, code);
+        return Omb_crsFromCatalogue(kind, number, choice);
     }
     if (kind == OmbString::literal("crs")) {
         if (number == 84) return longLatOn("Crs84LongLat", OmbGeodeticDatum::wgs84(), "84");
@@ -167,7 +169,15 @@ OmbRef<OmbCrs> OmbCrs::fromAuthorityAndCode(const OmbString& authority, const Om
             OMB_THROW(RangeError, "authorityCode", "Crs.FromAuthorityAndCode( \"esri\", authorityCode)",
                       "a five-digit number starting with 37, 53, 54 or 65, or a six-digit number starting with 102, "
                       "103 or 104.");
-        OMB_THROW(UnsupportedAuthority, authority, OmbString::literal("Crs.FromAuthorityAndCode"));
+        return Omb_crsFromCatalogue(kind, number, choice);
     }
     OMB_THROW(UnrecognizedAuthority, authority, code);
+}
+
+OmbRef<OmbCrs> OmbCrs::fromWellKnownText(const OmbString& wkt, OmbWellKnownTextFlavor flavor,
+                                         OmbDatumShiftChoice choice) {
+    if (flavor != OmbWellKnownTextFlavor::OgrWellKnownText && flavor != OmbWellKnownTextFlavor::EsriWellKnownText)
+        OMB_THROW(RangeError, "flavor", "Crs.fromWellKnownText(wkt, flavor, datumShiftChoice)",
+                  "OgrWellKnownText or EsriWellKnownText");
+    return Omb_crsFromWellKnownText(wkt, flavor == OmbWellKnownTextFlavor::EsriWellKnownText, choice);
 }

@@ -24,6 +24,7 @@
 #include <mutex>
 
 enum class OmbCrsLineType { GreatCircle = 0, GreatCircleApprox = 1, RhumbLine = 2 };
+enum class OmbWellKnownTextFlavor { OgrWellKnownText = 0, EsriWellKnownText = 1 };
 OMB_DESCRIBE_ENUM(OmbCrsLineType, "CrsLineType", {{"GreatCircle", 0}, {"GreatCircleApprox", 1}, {"RhumbLine", 2}})
 
 class OmbCrs : public OmbResourceObject {
@@ -137,11 +138,16 @@ public:
     bool compatibleWith(const OmbRef<OmbCrs>& other) const;
 
     // --- factories -------------------------------------------------------------
-    // "crs" codes 84, 83 and 27, the S-JTSK family, and the predefined EPSG
-    // systems; OmbXRangeError for codes outside an authority's ranges,
-    // OmbXUnrecognizedAuthority for another authority.
+    // "crs" codes 84, 83 and 27; EPSG and ESRI codes (the predefined systems
+    // where there is one, otherwise from the catalogue in GDAL); OmbXRangeError
+    // for codes outside an authority's ranges, OmbXUnrecognizedAuthority for
+    // another authority.
     static OmbRef<OmbCrs> fromAuthorityAndCode(const OmbString& authority, const OmbString& code,
                                                OmbDatumShiftChoice choice = OmbDatumShiftChoice::Conservative);
+    // From OGC (WKT1, WKT2) or ESRI well-known text.
+    static OmbRef<OmbCrs> fromWellKnownText(const OmbString& wkt,
+                                            OmbWellKnownTextFlavor flavor = OmbWellKnownTextFlavor::OgrWellKnownText,
+                                            OmbDatumShiftChoice choice = OmbDatumShiftChoice::Conservative);
     // "EPSG:4326" or "urn:ogc:def:crs:EPSG::4326" (OGC:CRS84 as crs:84).
     static OmbRef<OmbCrs> fromUrn(const OmbString& urn, OmbDatumShiftChoice choice = OmbDatumShiftChoice::Conservative);
     // The predefined WGS 84 UTM system of a zone; OmbXRangeError outside
