@@ -159,7 +159,10 @@ OmbRef<OmbGeodeticDatum> Converter::datum() {
         double towgs84[7] = {};
         if (srs_.GetTOWGS84(towgs84) != OGRERR_NONE && srs_.AddGuessedTOWGS84() == OGRERR_NONE)
             srs_.GetTOWGS84(towgs84);
-        if (srs_.GetTOWGS84(towgs84) == OGRERR_NONE) {
+        const char* geographic = srs_.GetAuthorityCode("GEOGCS");
+        if (srs_.GetTOWGS84(towgs84) != OGRERR_NONE && geographic)
+            shift = Omb_catalogueShiftToWgs84(std::atoi(geographic));
+        if (!shift && srs_.GetTOWGS84(towgs84) == OGRERR_NONE) {
             // GDAL's TOWGS84 rotates in the position-vector sense.
             OmbHelmertDatumShift::Parameters p;
             p.dx = towgs84[0], p.dy = towgs84[1], p.dz = towgs84[2];

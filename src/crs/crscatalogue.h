@@ -13,3 +13,6 @@ OmbRef<OmbCrs> Omb_crsFromCatalogue(const OmbString& authority, int code, OmbDat
 // The system of an OGC (WKT1 or WKT2) or ESRI well-known text;
 // OmbXGDALFailedToReadReferenceSystem when GDAL cannot read it.
 OmbRef<OmbCrs> Omb_crsFromWellKnownText(const OmbString& wkt, bool esri, OmbDatumShiftChoice choice);
+// The catalogue's best Helmert-family transformation from a geographic
+// system (EPSG code) to WGS 84; null when it has none.
+OmbRef<OmbDatumShift> Omb_catalogueShiftToWgs84(int geographicCode);

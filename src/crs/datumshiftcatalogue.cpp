@@ -1,5 +1,7 @@
 // Datum shifts built from the EPSG catalogue in PROJ's database.
 #include <oecore/core/exception.h>
+#include "crscatalogue.h"
+
 #include <oecore/crs/datumshift.h>
 
 #include <proj.h>
@@ -94,4 +96,38 @@ OmbRef<OmbDatumShift> OmbDatumShift::fromInfo(const OmbRef<OmbDatumShiftInfo>& i
     shift->authorityCode(info->authorityCode);
     shift->info(info);
     return OmbRef<OmbDatumShift>(shift);
+}
+
+OmbRef<OmbDatumShift> Omb_catalogueShiftToWgs84(int geographicCode) {
+    const Context context(proj_context_create());
+    proj_log_level(context.get(), PJ_LOG_NONE);
+    const std::string code = std::to_string(geographicCode);
+    const Object source(proj_create_from_database(context.get(), "EPSG", code.c_str(), PJ_CATEGORY_CRS, 0, nullptr));
+    const Object target(proj_create_from_database(context.get(), "EPSG", "4326", PJ_CATEGORY_CRS, 0, nullptr));
+    if (!source || !target) return {};
+    PJ_OPERATION_FACTORY_CONTEXT* factory = proj_create_operation_factory_context(context.get(), nullptr);
+    proj_operation_factory_context_set_spatial_criterion(context.get(), factory,
+                                                         PROJ_SPATIAL_CRITERION_PARTIAL_INTERSECTION);
+    PJ_OBJ_LIST* operations = proj_create_operations(context.get(), source.get(), target.get(), factory);
+    OmbRef<OmbDatumShift> found;
+    // PROJ lists the operations best first; the first single Helmert-family
+    // transformation wins.
+    const int count = operations ? proj_list_get_count(operations) : 0;
+    for (int i = 0; i < count && !found; ++i) {
+        const Object operation(proj_list_get(context.get(), operations, i));
+        const char* authority = operation ? proj_get_id_auth_name(operation.get(), 0) : nullptr;
+        const char* id = operation ? proj_get_id_code(operation.get(), 0) : nullptr;
+        if (!authority || !id || std::strcmp(authority, "EPSG") != 0) continue;
+        OmbRef<OmbDatumShiftInfo> info(new OmbDatumShiftInfo);
+        info->authority = OmbString::literal("epsg");
+        info->authorityCode = OmbString(id);
+        info->name(OmbString(proj_get_name(operation.get())));
+        try {
+            found = OmbDatumShift::fromInfo(info);
+        } catch (const OmbException&) {
+        }
+    }
+    if (operations) proj_list_destroy(operations);
+    proj_operation_factory_context_destroy(factory);
+    return found;
 }

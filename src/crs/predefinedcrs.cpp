@@ -47,21 +47,19 @@ int codeNumber(const OmbString& code) {
     return end != digits.c_str() && *end == '\0' && value > 0 && value < 1000000 ? int(value) : 0;
 }
 
-// A datum nothing is known to tie to WGS 84, assumed to coincide with it.
-OmbRef<OmbGeodeticDatum> assumedOnWgs84(const OmbRef<OmbEllipsoid>& ellipsoid, const char* name, const char* code) {
+// NAD27 with the catalogue's shift for the contiguous United States (EPSG
+// 1173), the one generally useful for "crs:27" data.
+OmbRef<OmbGeodeticDatum> nad27ContiguousUs() {
+    const OmbRef<OmbGeodeticDatum> catalogued =
+        Omb_crsFromCatalogue(OmbString::literal("epsg"), 4267, OmbDatumShiftChoice::Lenient)->geodeticDatum();
     OmbRef<OmbDatumShiftInfo> info(new OmbDatumShiftInfo);
-    info->name(OmbString::literal("Assume identical to Wgs84."));
-    info->authority = OmbString::literal("ombravel");
-    info->authorityCode = OmbString::literal("51048");
-    info->remarks = OmbString::literal("Unknown accuracy, but errors are probably less than 1000 m.");
-    info->scope = OmbString::literal("Ombravel knows nothing about how this datum is related to Wgs84.");
-    info->datumShiftChoice = OmbDatumShiftChoice::Lenient;
-    OmbRef<OmbIdentityDatumShift> shift(new OmbIdentityDatumShift);
-    shift->info(info);
-    OmbRef<OmbGeodeticDatum> datum(new OmbGeodeticDatum(ellipsoid, OmbPrimeMeridian::greenwich(), shift));
-    datum->name(OmbString(name));
-    datum->authority(OmbString::literal("epsg"));
-    datum->authorityCode(OmbString(code));
+    info->authority = OmbString::literal("epsg");
+    info->authorityCode = OmbString::literal("1173");
+    OmbRef<OmbGeodeticDatum> datum(
+        new OmbGeodeticDatum(catalogued->ellipsoid(), catalogued->primeMeridian(), OmbDatumShift::fromInfo(info)));
+    datum->name(catalogued->name());
+    datum->authority(catalogued->authority());
+    datum->authorityCode(catalogued->authorityCode());
     return datum;
 }
 
@@ -160,7 +158,7 @@ OmbRef<OmbCrs> OmbCrs::fromAuthorityAndCode(const OmbString& authority, const Om
         if (number == 83) return longLatOn("Crs83LongLat", OmbGeodeticDatum::wgs84(), "83");
         if (number == 27) {
             if (choice == OmbDatumShiftChoice::Conservative) OMB_THROW(NoDatumShiftForNad27);
-            return longLatOn("Crs27LongLat", assumedOnWgs84(OmbEllipsoid::clarke1866(), "NAD27", "6267"), "27");
+            return longLatOn("Crs27LongLat", nad27ContiguousUs(), "27");
         }
         OMB_THROW(RangeError, "authorityCode", "Crs.FromAuthorityAndCode( \"crs\", authorityCode)", "27, 83 or 84.");
     }
