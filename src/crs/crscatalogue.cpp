@@ -140,6 +140,12 @@ private:
     OmbRef<OmbGeodeticDatum> datum();
     // 0 for a sphere.
     double inverseFlatteningOf() const { return srs_.GetInvFlattening(); }
+    // Whether the first axis points east or north (not south or west).
+    bool northOriented() const {
+        OGRAxisOrientation orientation = OAO_East;
+        srs_.GetAxis("PROJCS", 0, &orientation);
+        return orientation == OAO_East || orientation == OAO_North || orientation == OAO_Other;
+    }
 
     OGRSpatialReference& srs_;
     OmbString source_;
@@ -185,6 +191,14 @@ OmbRef<OmbGeodeticDatum> Converter::datum() {
         shift = assumedShift(greenwich, inverseFlattening == 0);
     }
     OmbRef<OmbPrimeMeridian> meridian(new OmbPrimeMeridian(primeMeridian));
+    if (!greenwich && !dynamic_cast<OmbChangedPrimeMeridianDatumShift*>(shift.get())) {
+        // Longitudes count from the datum's own meridian; the catalogue's
+        // shift applies to Greenwich longitudes on the same ellipsoid.
+        OmbRef<OmbGeodeticDatum> onGreenwich(new OmbGeodeticDatum(ellipsoid, OmbPrimeMeridian::greenwich(), shift));
+        onGreenwich->name(OmbString(std::string(datumTitle ? datumTitle : "datum") + " (Greenwich)"));
+        shift = OmbRef<OmbDatumShift>(new OmbChangedPrimeMeridianDatumShift);
+        shift->knownDatum(onGreenwich);
+    }
     OmbRef<OmbGeodeticDatum> datum(new OmbGeodeticDatum(ellipsoid, meridian, shift));
     datum->name(OmbString(datumTitle ? datumTitle : "with unknown name"));
     if (const char* code = srs_.GetAuthorityCode("DATUM")) {
@@ -278,6 +292,8 @@ OmbRef<OmbProjection> Converter::projection() const {
         origin(*r, lonC, latC);
         return named(r, "Rosenmund_EPSG_");
     }
+    if (method == SRS_PT_KROVAK && !northOriented())
+        OMB_THROW(UnsupportedProjectionType, OmbString::literal("Krovak (south-west oriented)"));
     if (method == SRS_PT_KROVAK) {
         auto* kr = new OmbKrovak;
         origin(*kr, lonC, latC);
@@ -301,6 +317,7 @@ OmbRef<OmbProjection> Converter::projection() const {
             p->scaleFactor(k);
         return named(p, "Stereogr_EPSG_");
     }
+    if (method == SRS_PT_NEW_ZEALAND_MAP_GRID) return named(new OmbNewZealandMapGrid, "NZMG_EPSG_");
     if (method == SRS_PT_EQUIRECTANGULAR) {
         auto* e = new OmbEquidistantCylindrical;
         origin(*e, lon0, lat0);

@@ -1,0 +1,112 @@
+// Systems from the EPSG catalogue against PROJ's own projection of the
+// same definitions, and the walk over every code the catalogue knows.
+#include <oecore/core/exception.h>
+#include <oecore/crs/crs.h>
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <sstream>
+#include <vector>
+
+#include "../errortext.h"
+#include "../runtimescope.h"
+#include "projectiontest.h"
+#include "referencetool.h"
+
+namespace {
+
+class Catalogue : public RuntimeScope {};
+
+// PROJ's definition of an EPSG system and its area of use.
+struct Reference {
+    std::string proj;
+    OmbRect area = OmbRect::invalid();
+};
+
+Reference reference(int code) {
+    Reference r;
+    for (const std::string& line : runReferenceTool("projinfo -o PROJ,WKT2:2019 EPSG:" + std::to_string(code), {})) {
+        if (line.rfind("+proj=", 0) == 0) r.proj = line.substr(0, line.find(" +type=crs"));
+        const std::size_t box = line.find("BBOX[");
+        double s, w, n, e;
+        if (box != std::string::npos && std::sscanf(line.c_str() + box, "BBOX[%lf,%lf,%lf,%lf", &s, &w, &n, &e) == 4)
+            r.area = {w, s, e, n};
+    }
+    return r;
+}
+
+// The largest distance in projected units between our projection of
+// random points of the area and PROJ's.
+double worstAgainstProj(const OmbCrs& crs, const Reference& r, unsigned seed) {
+    OmbRect area = r.area;
+    if (area.xmax < area.xmin) area.xmax += 360;  // across 180 degrees
+    const auto points = randomPoints(seed, 200, area.xmin, area.xmax, area.ymin, area.ymax);
+    std::vector<std::string> lines;
+    char line[64];
+    for (const OmbPoint& p : points) {
+        std::snprintf(line, sizeof line, "%.12f %.12f", p.x, p.y);
+        lines.push_back(line);
+    }
+    const auto expected = runReferenceTool("proj -f %.6f " + r.proj, lines);
+    if (expected.size() != points.size()) return HUGE_VAL;
+    // Our longitudes count from the datum's own prime meridian.
+    const double meridian = crs.geodeticDatum()->primeMeridianDegrees();
+    double worst = 0;
+    for (std::size_t i = 0; i < points.size(); ++i) {
+        OmbPoint ours(points[i].x - meridian, points[i].y), theirs;
+        std::istringstream(expected[i]) >> theirs.x >> theirs.y;
+        crs.project(ours);
+        worst = std::max(worst, ours.distanceTo(theirs));
+    }
+    return worst;
+}
+
+}  // namespace
+
+// Fifty-six projected systems across the supported methods, units and
+// prime meridians, each within a millimetre of PROJ on 200 points of its
+// area of use. Not here: EPSG 4087 (equidistant cylindrical on the
+// ellipsoid), where PROJ takes the spherical formula with the equatorial
+// radius while ours follows the ellipsoid's meridian (25 km apart at the
+// poles).
+TEST_F(Catalogue, ProjectedSystemsAgreeWithProj) {
+    // clang-format off
+    const std::vector<int> systems = {
+        // Transverse Mercator, in metres and feet.
+        25832, 27700, 31467, 2193, 28356, 2100, 3067, 2039, 26910, 3414, 29902, 2157, 32633, 3006, 2229, 32760,
+        21035, 22234, 5650,
+        // Lambert conformal conic, 1SP and 2SP, feet and the Paris meridian.
+        2154, 3034, 3347, 31370, 27572, 2062, 2249, 3978, 2264, 3112,
+        // Mercator.
+        3395, 3857, 3832, 3994,
+        // Stereographic: polar (both variants) and oblique (EPSG 9809).
+        3031, 3413, 5041, 3976, 28992, 3844, 2953,
+        // Albers and Lambert azimuthal equal area.
+        5070, 3338, 3174, 3035, 3577, 3573,
+        // Oblique Mercators: Hotine (both variants), Laborde, Swiss.
+        2056, 3375, 29873, 29701, 21781,
+        // Cassini-Soldner, Krovak, New Zealand map grid, equidistant
+        // cylindrical on a sphere.
+        30200, 3068, 5514, 27200, 3786,
+    };
+    // clang-format on
+    unsigned seed = 1;
+    int compared = 0;
+    for (const int code : systems) {
+        SCOPED_TRACE("EPSG:" + std::to_string(code));
+        const Reference r = reference(code);
+        ASSERT_FALSE(r.proj.empty() || r.area.ymin > r.area.ymax) << "projinfo (proj-bin) is needed";
+        OmbRef<OmbCrs> crs;
+        try {
+            crs = OmbCrs::fromAuthorityAndCode(OmbString("epsg"), OmbString(std::to_string(code)),
+                                               OmbDatumShiftChoice::Lenient);
+        } catch (const OmbException& e) {
+            ADD_FAILURE() << std::string(e.asString());
+            continue;
+        }
+        EXPECT_LT(worstAgainstProj(*crs, r, seed++), 1e-3) << r.proj;
+        ++compared;
+    }
+    EXPECT_GE(compared, 50);
+}
