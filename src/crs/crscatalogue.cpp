@@ -18,6 +18,7 @@
 #include <oecore/crs/projections/transversemercator.h>
 #include <oecore/crs/projections/wrappedprojections.h>
 
+#include <cpl_error.h>
 #include <ogr_spatialref.h>
 
 #include <algorithm>
@@ -328,9 +329,20 @@ OmbRef<OmbProjection> Converter::projection() const {
     OMB_THROW(UnsupportedProjectionType, OmbString(method));
 }
 
+// GDAL's own error reports stay quiet while it reads for us: failures
+// become our exceptions.
+class QuietGdal {
+public:
+    QuietGdal() { CPLPushErrorHandler(CPLQuietErrorHandler); }
+    ~QuietGdal() { CPLPopErrorHandler(); }
+    QuietGdal(const QuietGdal&) = delete;
+    QuietGdal& operator=(const QuietGdal&) = delete;
+};
+
 }  // namespace
 
 OmbRef<OmbCrs> Omb_crsFromCatalogue(const OmbString& authority, int code, OmbDatumShiftChoice choice) {
+    const QuietGdal quiet;
     OGRSpatialReference srs;
     OmbStringBuilder definition;
     definition << authority.toUpper() << ":" << code;
@@ -346,6 +358,7 @@ OmbRef<OmbCrs> Omb_crsFromCatalogue(const OmbString& authority, int code, OmbDat
 }
 
 OmbRef<OmbCrs> Omb_crsFromWellKnownText(const OmbString& wkt, bool esri, OmbDatumShiftChoice choice) {
+    const QuietGdal quiet;
     OGRSpatialReference srs;
     const std::string text(wkt);
     OGRErr error;

@@ -6,7 +6,9 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
+#include <map>
 #include <sstream>
+#include <utility>
 #include <vector>
 
 #include "../errortext.h"
@@ -109,4 +111,25 @@ TEST_F(Catalogue, ProjectedSystemsAgreeWithProj) {
         ++compared;
     }
     EXPECT_GE(compared, 50);
+}
+
+// Every code of the accepted ranges: built, or refused with an engine
+// error (a code the catalogue lacks, a method or datum we cannot take).
+TEST_F(Catalogue, EveryCodeBuildsOrFailsCleanly) {
+    int built = 0, refused = 0;
+    std::map<std::string, int> reasons;
+    for (const auto& [first, last] : {std::pair(2000, 5999), std::pair(7000, 7999), std::pair(20000, 32767)})
+        for (int code = first; code <= last; ++code) {
+            try {
+                OmbCrs::fromAuthorityAndCode(OmbString("epsg"), OmbString(std::to_string(code)));
+                ++built;
+            } catch (const OmbException& e) {
+                const std::string text(e.asString());
+                ++reasons[text.substr(0, text.find(' ', 20))];
+                ++refused;
+            }
+        }
+    std::printf("EPSG codes built: %d; refused: %d\n", built, refused);
+    for (const auto& [reason, count] : reasons) std::printf("  %6d  %s...\n", count, reason.c_str());
+    EXPECT_GT(built, 4000);
 }
