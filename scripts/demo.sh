@@ -15,3 +15,6 @@ echo
 "$omb" datum "$root/data/demo/harbour.px" OSGB36 Datums.Wgs84 -2,53,100 -0.1276,51.5072
 echo
 "$omb" project "$root/data/demo/harbour.px" BritishNationalGrid OSGB36 1.717921583,52.657570306 -0.1276,51.5072
+echo
+"$omb" transform --from epsg:27700 --to epsg:4326 651409.903 313177.270
+"$omb" crs epsg:2154 | head -6

@@ -78,3 +78,13 @@ expect("project;${DEMO};Projections.mercator1SP_web;Datums.Wgs84;180,0" 0 "^2003
 expect("project;${DEMO};Utm61N;Datums.Wgs84;1,2" 1 "no projection named 'Utm61N'")
 expect("project;${DEMO};BritishNationalGrid;OSGB36;1" 2 "'1' is not LON,LAT or LON,LAT,H")
 expect("unproject;${DEMO};BritishNationalGrid" 2 "unproject takes FILE.px PROJECTION DATUM and at least one X,Y")
+
+# Coordinate systems by code, URN or predefined name; points as arguments or
+# lines on standard input.
+expect("transform;--from;epsg:27700;--to;epsg:4326;651409.903;313177.270" 0 "^1\\.71605[0-9]+ 52\\.65797[0-9]+ ")
+expect("transform;--from;crs:84;--to;Crs.Wgs84Utm32N;10;55;100" 0 "^563967\\.42[0-9]+ 6095248\\.708[0-9]+ 100\\.0000")
+expect("transform;--from;urn:ogc:def:crs:EPSG::3857;--to;epsg:4326;10018754.171394622;0" 0 "^90\\.000000000 0\\.000000000")
+expect("transform;--from;epsg:1999;--to;epsg:4326;1;2" 1 "should be between 2000 and 5999")
+expect("transform;--from;epsg:4326;1;2" 2 "transform takes --from CRS --to CRS")
+expect("crs;epsg:2154" 0 "name: RGF93 v1 / Lambert-93\ncode: epsg:2154\nprojection: LCC_EPSG_2154 \\(LambertConformalConicProjection\\)")
+expect("crs;Crs.Wgs84MercatorWeb" 0 "PROJCS\\[\"WGS 84 / Pseudo-Mercator\"")

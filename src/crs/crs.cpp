@@ -1,3 +1,4 @@
+#include "crscatalogue.h"
 #include "projections/projectionmath.h"
 
 #include <oecore/core/exception.h>
@@ -291,6 +292,20 @@ OmbPointArray OmbCrs::route(const OmbPoint& a, const OmbPoint& b, OmbCrsLineType
     project(nodes);
     nodes[0] = a, nodes[nodes.size() - 1] = b;
     return nodes;
+}
+
+OmbString OmbCrs::toWellKnownText(bool pretty, OmbWellKnownTextFlavor flavor) const {
+    const OmbString kind = authority_.toLower();
+    int code = 0;
+    if (kind == OmbString::literal("epsg") && !codeIsLabelOnly_) code = id();
+    if (kind == OmbString::literal("crs") &&
+        (authorityCode_ == OmbString::literal("84") || authorityCode_ == OmbString::literal("83")))
+        code = 4326;
+    const OmbString wkt =
+        code ? Omb_catalogueWellKnownText(code, pretty, flavor == OmbWellKnownTextFlavor::EsriWellKnownText)
+             : OmbString();
+    if (wkt.empty()) OMB_THROW(UnsupportedProjection);
+    return wkt;
 }
 
 // --- comparison -------------------------------------------------------------------

@@ -372,3 +372,20 @@ OmbRef<OmbCrs> Omb_crsFromWellKnownText(const OmbString& wkt, bool esri, OmbDatu
         OMB_THROW(GDALFailedToReadReferenceSystem, wkt, OmbString::literal("not well-known text GDAL can read"));
     return Converter(srs, OmbString::literal("from well-known text"), choice).crs();
 }
+
+OmbString Omb_catalogueWellKnownText(int epsgCode, bool pretty, bool esri) {
+    const QuietGdal quiet;
+    OGRSpatialReference srs;
+    if (srs.importFromEPSG(epsgCode) != OGRERR_NONE) return {};
+    if (esri) srs.morphToESRI();
+    const char* options[] = {pretty ? "MULTILINE=YES" : "MULTILINE=NO", esri ? "FORMAT=WKT1_ESRI" : "FORMAT=WKT1",
+                             nullptr};
+    char* text = nullptr;
+    if (srs.exportToWkt(&text, options) != OGRERR_NONE || !text) {
+        CPLFree(text);
+        return {};
+    }
+    const OmbString wkt(text);
+    CPLFree(text);
+    return wkt;
+}

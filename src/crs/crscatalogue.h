@@ -16,3 +16,6 @@ OmbRef<OmbCrs> Omb_crsFromWellKnownText(const OmbString& wkt, bool esri, OmbDatu
 // The catalogue's best Helmert-family transformation from a geographic
 // system (EPSG code) to WGS 84; null when it has none.
 OmbRef<OmbDatumShift> Omb_catalogueShiftToWgs84(int geographicCode);
+// The catalogue's well-known text of an EPSG code ("crs" 84 and 83 as
+// EPSG 4326); empty when the catalogue lacks the code.
+OmbString Omb_catalogueWellKnownText(int epsgCode, bool pretty, bool esri);

@@ -1,4 +1,6 @@
 // omb: the OECore command-line tool.
+#include "crscommands.h"
+
 #include <oecore/oecore.h>
 
 #include <clocale>
@@ -33,9 +35,17 @@ void printHelp(std::ostream& out) {
            "                         (Projections.mercator1SP_web), or UTM zones as Utm33N, Utm33S\n"
            "  unproject FILE.px PROJECTION DATUM X,Y[,Z]...\n"
            "                         the reverse: projected points back to degrees\n"
+           "  transform --from CRS --to CRS [X Y [Z]]\n"
+           "                         transform a point, or one 'X Y [Z]' line at a time from standard\n"
+           "                         input (x is longitude in long/lat systems)\n"
+           "  crs CRS                describe a coordinate reference system\n"
+           "\n"
+           "CRS: epsg:NNNN, esri:NNNNNN, crs:84, an OGC URN (urn:ogc:def:crs:EPSG::4326), a predefined\n"
+           "name (Crs.Wgs84LongLat, Crs.Wgs84Utm33N) or @FILE with well-known text.\n"
            "\n"
            "Options:\n"
            "  --param KEY=VALUE  a configuration parameter for ConfigurationParameter (repeatable)\n"
+           "  --lenient          assume a datum coincides with WGS 84 when no shift is known\n"
            "  --log-file FILE    write the library's log to FILE (rotated at 10 MiB, 4 files)\n"
            "  --log-level LEVEL  all, debug, info, warning, error, fatal or off (default: off,\n"
            "                     or all when a log file is given)\n"
@@ -57,25 +67,24 @@ void printClasses(std::ostream& out) {
     out << count << " engine classes\n";
 }
 
-struct Options {
-    std::string command;
-    std::vector<std::string> files;
-    std::vector<std::pair<std::string, std::string>> params;
-    std::string logFile;
-    std::string logLevel;
-};
-
 // Returns false, having said why, when the arguments do not parse.
 bool parse(int argc, char** argv, Options& options) {
     for (int i = 1; i < argc; ++i) {
         const std::string arg = argv[i];
-        const bool takesValue = arg == "--log-file" || arg == "--log-level" || arg == "--param";
+        const bool takesValue =
+            arg == "--log-file" || arg == "--log-level" || arg == "--param" || arg == "--from" || arg == "--to";
         if (takesValue && i + 1 >= argc) {
             std::cerr << "omb: " << arg << " needs a value; see 'omb --help'\n";
             return false;
         }
         if (arg == "--log-file")
             options.logFile = argv[++i];
+        else if (arg == "--from")
+            options.from = argv[++i];
+        else if (arg == "--to")
+            options.to = argv[++i];
+        else if (arg == "--lenient")
+            options.lenient = true;
         else if (arg == "--log-level")
             options.logLevel = argv[++i];
         else if (arg == "--param") {
@@ -297,6 +306,8 @@ int run(const Options& options) {
     if (options.command == "datum") return convertDatum(options);
     if (options.command == "project" || options.command == "unproject")
         return projectPoints(options, options.command == "unproject");
+    if (options.command == "transform") return transformPoints(options);
+    if (options.command == "crs") return describeCrs(options);
     if (options.command == "info" && options.files.empty()) {
         std::cout << "OECore " << OmbRuntime::version() << "\n";
         printClasses(std::cout);

@@ -126,6 +126,11 @@ public:
     OmbPointArray greatCircleRoute(const OmbPoint& a, const OmbPoint& b, double maxSegmentLength) const {
         return route(a, b, OmbCrsLineType::GreatCircle, maxSegmentLength);
     }
+    // The catalogue's well-known text for a system with an EPSG or "crs"
+    // code; OmbXUnsupportedProjection for a system without one.
+    OmbString toWellKnownText(bool pretty,
+                              OmbWellKnownTextFlavor flavor = OmbWellKnownTextFlavor::OgrWellKnownText) const;
+
     // Moves a projected rectangle of a cyclic world into the world.
     void adjustRect(OmbRect& rect) const { projection_->adjustRect(rect, cached_.get()); }
 

@@ -146,6 +146,10 @@ void OmbLambertConformalConic2SP::nominalMetersXY(const OmbProjCachedNumbers* ca
     mx = my = cached->metersPerUnit / scaleFactor();
 }
 
+OmbRect OmbLambertConformalConic2SP::getValidArea(const OmbProjCachedNumbers* cached) const {
+    return numbers(cached).cone > 0 ? OmbRect(-180, -89.999, 180, 90) : OmbRect(-180, -90, 180, 89.999);
+}
+
 bool OmbLambertConformalConic2SP::isValid(const OmbPoint& lola, const OmbProjCachedNumbers* cached) const {
     if (!OmbProjection::isValid(lola, cached)) return false;
     const double farPole = numbers(cached).cone > 0 ? -90 : 90;

@@ -32,7 +32,9 @@ public:
     void unproject(OmbPointArray& points, const OmbProjCachedNumbers* cached) const override;
     void unproject(OmbPoint& p, const OmbProjCachedNumbers* cached) const override;
     void nominalMetersXY(const OmbProjCachedNumbers* cached, double& mx, double& my) const override;
-    // The pole opposite the cone's apex maps to infinity.
+    // The pole opposite the cone's apex maps to infinity: the valid area
+    // stops a thousandth of a degree short of it.
+    OmbRect getValidArea(const OmbProjCachedNumbers* cached) const override;
     bool isValid(const OmbPoint& lola, const OmbProjCachedNumbers* cached) const override;
     bool isValidGlobally() const override { return false; }
     bool equivalent(const OmbProjection& other) const override;
