@@ -4,6 +4,7 @@
 // Mercator; and WGS 84 to the British National Grid (a Helmert shift to
 // OSGB 36 followed by Transverse Mercator).
 #include <oecore/core/runtime.h>
+#include <oecore/crs/crs.h>
 #include <oecore/crs/projections/transversemercator.h>
 
 #include <proj.h>
@@ -73,12 +74,24 @@ struct Case {
     const OmbPointArray& source;
     std::function<void(OmbPointArray&)> convert;
     std::string pipeline;
+    bool degreesIn = true;  // the pipeline starts by converting degrees
 };
 
 std::function<void(OmbPointArray&)> projecting(const OmbRef<OmbProjection>& projection,
                                                const OmbRef<OmbGeodeticDatum>& datum) {
     std::shared_ptr<OmbProjCachedNumbers> cached(projection->init(*datum));
     return [projection, cached](OmbPointArray& points) { projection->project(points, cached.get()); };
+}
+
+// British National Grid coordinates of the same points.
+const OmbPointArray& nationalGrid() {
+    static const OmbPointArray points = [] {
+        OmbPointArray p = greatBritain();
+        const std::unique_ptr<OmbProjCachedNumbers> cached(britishNationalGrid()->init(*osgb36()));
+        britishNationalGrid()->project(p, cached.get());
+        return p;
+    }();
+    return points;
 }
 
 std::vector<Case> cases() {
@@ -101,11 +114,23 @@ std::vector<Case> cases() {
          std::string("+step +proj=cart +ellps=WGS84 +step +inv ") + osgbHelmert +
              " +step +inv +proj=cart +ellps=airy"
              " +step +proj=tmerc +lat_0=49 +lon_0=-2 +k_0=0.9996012717 +x_0=400000 +y_0=-100000 +ellps=airy"},
+        // Between two catalogue systems on different datums: EPSG 27700 to
+        // UTM 30 north, through the catalogue's Helmert shift (EPSG 1314).
+        {"CrsToCrs", nationalGrid(),
+         [source = OmbCrs::fromAuthorityAndCode(OmbString("epsg"), OmbString("27700")),
+          target = OmbCrs::wgs84Utm(30, OmbUTMHemisphere::North)](OmbPointArray& points) {
+             source->projectTo(*target, points);
+         },
+         "+step +inv +proj=tmerc +lat_0=49 +lon_0=-2 +k_0=0.9996012717 +x_0=400000 +y_0=-100000 +ellps=airy "
+         "+step +proj=cart +ellps=airy +step " +
+             std::string(osgbHelmert) + " +step +inv +proj=cart +ellps=WGS84 +step +proj=utm +zone=30 +ellps=WGS84",
+         false},
     };
 }
 
-PJ* createPipeline(PJ_CONTEXT* context, const std::string& pipeline) {
-    return proj_create(context, ("+proj=pipeline +step +proj=unitconvert +xy_in=deg +xy_out=rad " + pipeline).c_str());
+PJ* createPipeline(PJ_CONTEXT* context, const Case& c) {
+    const std::string units = c.degreesIn ? "+step +proj=unitconvert +xy_in=deg +xy_out=rad " : "";
+    return proj_create(context, ("+proj=pipeline " + units + c.pipeline).c_str());
 }
 
 void transformWithProj(PJ* pj, std::vector<OmbPoint>& points) {
@@ -126,7 +151,7 @@ void runOECore(benchmark::State& state, const Case& c) {
 
 void runProj(benchmark::State& state, const Case& c) {
     PJ_CONTEXT* context = proj_context_create();
-    PJ* pj = createPipeline(context, c.pipeline);
+    PJ* pj = createPipeline(context, c);
     for (auto _ : state) {
         std::vector<OmbPoint> points(c.source.begin(), c.source.end());
         transformWithProj(pj, points);
@@ -144,7 +169,7 @@ double worstDifference(const Case& c) {
     c.convert(ours);
     std::vector<OmbPoint> theirs(c.source.begin(), c.source.end());
     PJ_CONTEXT* context = proj_context_create();
-    PJ* pj = createPipeline(context, c.pipeline);
+    PJ* pj = createPipeline(context, c);
     transformWithProj(pj, theirs);
     proj_destroy(pj);
     proj_context_destroy(context);
