@@ -280,3 +280,57 @@ TEST_F(Crs, ReadFromConfigurations) {
               "n: In Crs n, value \"geodeticDatum\" is null but value \"projection\" is not, and automatic "
               "extraction from authorityCode requires both to be null. Row 1, Column 30.");
 }
+
+TEST_F(Crs, DegreesMinutesAndSecondsAsText) {
+    const auto parts = [](const OmbRef<OmbVec<OmbString>>& v) {
+        std::string joined;
+        for (const OmbString& s : *v) joined += std::string(s) + "|";
+        return joined;
+    };
+    EXPECT_EQ(parts(OmbCrs::formatLatitudeAsDegreesMinutesSeconds(59.3293235, 2)), "59|19|45.56|N|");
+    EXPECT_EQ(parts(OmbCrs::formatLongitudeAsDegreesMinutes(-18.0686, 3)), "18|04.116|W|");
+    // Rounding carries instead of showing 60.
+    EXPECT_EQ(parts(OmbCrs::formatLatitudeAsDegreesMinutesSeconds(-10.99999999, 1)), "11|00|00.0|S|");
+    EXPECT_EQ(parts(OmbCrs::formatLongitudeAsDegreesMinutes(179.9999999, 0)), "180|00|E|");
+
+    EXPECT_DOUBLE_EQ(OmbCrs::parseLatitude(OmbString("59"), OmbString("19"), OmbString("45,56"), OmbString("N")),
+                     59 + 19 / 60.0 + 45.56 / 3600);
+    EXPECT_DOUBLE_EQ(OmbCrs::parseLongitude(OmbString(" 18 "), OmbString("4.116"), OmbString("W")), -(18 + 4.116 / 60));
+    EXPECT_DOUBLE_EQ(OmbCrs::parseLongitude(OmbString("-120"), OmbString("30"), OmbString()), -120.5);
+    const auto latitudeError = [](const char* d, const char* m, const char* s, const char* h) {
+        return errorOf([&] { OmbCrs::parseLatitude(OmbString(d), OmbString(m), OmbString(s), OmbString(h)); });
+    };
+    EXPECT_EQ(latitudeError("1234", "0", "0", "N"),
+              "Crs.ParseLatitude(). Too long string 1234 as degrees component, should be 1 to 3 digits.");
+    EXPECT_EQ(latitudeError("12", "123", "0", "N"),
+              "Crs.ParseLatitude(). Too long string 123 as minutes component, should be 1 to 2 digits.");
+    EXPECT_EQ(latitudeError("12", "", "0", "N"),
+              "Crs.ParseLatitude(). Empty string as minutes component, should be 1 to 2 digits.");
+    EXPECT_EQ(latitudeError("-12", "0", "0", "N"),
+              "Crs.ParseLatitude(). The string \"-12\", representing a degrees component, contains a minus, but "
+              "should be an non-negative integer since there is also a hemisphere character.");
+    EXPECT_EQ(latitudeError("12.5", "0", "0", "N"),
+              "Crs.ParseLatitude(). The string \"12.5\", representing a degrees component, contains a decimal point, "
+              "but should be an integer since there is also a minutes component.");
+    EXPECT_EQ(latitudeError("12", "3,5", "0", "N"),
+              "Crs.ParseLatitude(). The string \"3,5\", representing a minutes component, contains a decimal comma, "
+              "but should be an integer since there is also a seconds component.");
+    EXPECT_EQ(latitudeError("12", "3", "4.5,6", "N"),
+              "Crs.ParseLatitude(). The string \"4.5,6\", representing a seconds component, contains both a dot and "
+              "a comma.");
+    EXPECT_EQ(latitudeError("12", "3", "4.5.6", "N"),
+              "Crs.ParseLatitude(). The string \"4.5.6\", representing a seconds component, contains too many "
+              "decimal separators.");
+    EXPECT_EQ(latitudeError("12", "3", ".5", "N"),
+              "Crs.ParseLatitude(). The string \".5\", representing a seconds component, must have one or two digits "
+              "before the decimal separator.");
+    EXPECT_EQ(latitudeError("1x", "3", "4", "N"),
+              "Crs.ParseLatitude(). The string \"1x\", representing a degrees component, contains a non-digit.");
+    EXPECT_EQ(latitudeError("12", "3", "4.x", "N"),
+              "Crs.ParseLatitude(). The string \"4.x\", representing a seconds component, contains a non-digit in "
+              "its fractional part.");
+    EXPECT_EQ(latitudeError("91", "0", "0", "N"),
+              "Value \"degrees = 91\" is out of range in Crs.ParseLatitude(), should be 0 to 90.");
+    EXPECT_EQ(latitudeError("90", "0", "0.1", "S"),
+              "Value \"value\" is out of range in Crs.ParseLatitude(), should be 0 to 90.");
+}

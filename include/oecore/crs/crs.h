@@ -16,6 +16,7 @@
 #pragma once
 
 #include <oecore/attr/atoms.h>
+#include <oecore/core/vec.h>
 #include <oecore/crs/datumshiftinfo.h>
 #include <oecore/crs/geodesic.h>
 #include <oecore/crs/projection.h>
@@ -175,6 +176,27 @@ public:
     // This system with its projection moved so that the longitude (on the
     // projected origin's parallel) projects to (0, 0); named "...Recentered".
     OmbRef<OmbCrs> recenteredClone(double longitude) const;
+
+    // --- degrees, minutes and seconds as text ----------------------------------
+    // The components of a latitude or longitude: degrees, minutes (with the
+    // decimals in the DM form), seconds (with the decimals), and the
+    // hemisphere letter N, S, E or W. Rounded once at the last component,
+    // so no component reaches 60.
+    static OmbRef<OmbVec<OmbString>> formatLatitudeAsDegreesMinutes(double value, int decimals);
+    static OmbRef<OmbVec<OmbString>> formatLatitudeAsDegreesMinutesSeconds(double value, int decimals);
+    static OmbRef<OmbVec<OmbString>> formatLongitudeAsDegreesMinutes(double value, int decimals);
+    static OmbRef<OmbVec<OmbString>> formatLongitudeAsDegreesMinutesSeconds(double value, int decimals);
+    // Degrees from components as typed: degrees 1 to 3 digits, minutes and
+    // seconds 1 to 2 digits before an optional decimal point or comma (only
+    // in the last component); the hemisphere N/S (E/W for longitudes), or
+    // empty with an optional minus on the degrees. Each fault has its own
+    // OmbX...DegMinSecComponent error; values out of range an OmbXRangeError.
+    static double parseLatitude(const OmbString& degrees, const OmbString& minutes, const OmbString& hemisphere);
+    static double parseLatitude(const OmbString& degrees, const OmbString& minutes, const OmbString& seconds,
+                                const OmbString& hemisphere);
+    static double parseLongitude(const OmbString& degrees, const OmbString& minutes, const OmbString& hemisphere);
+    static double parseLongitude(const OmbString& degrees, const OmbString& minutes, const OmbString& seconds,
+                                 const OmbString& hemisphere);
 
     static bool reasonableEpsgCode(int code);
     static bool reasonableEsriCode(int code);
