@@ -174,6 +174,34 @@ bool OmbCrs::projectTo(const OmbCrs& target, const OmbRect& in, OmbRect& out) co
     }
 }
 
+OmbPoint OmbCrs::unprojectToGeocentricXYZ(const OmbPoint& p) const {
+    OmbPoint q = p;
+    unproject(q);
+    datum_->ellipsoid()->geodeticToGeocentricXYZ(q.x, q.y, q.z);
+    return q;
+}
+
+OmbPoint OmbCrs::projectFromGeocentricXYZ(const OmbPoint& xyz) const {
+    OmbPoint q = xyz;
+    datum_->ellipsoid()->geocentricXYZToGeodetic(q.x, q.y, q.z);
+    project(q);
+    return q;
+}
+
+int OmbCrs::checkValidity(const OmbPointArray& lola, std::vector<bool>& flags) const {
+    flags.assign(lola.size(), false);
+    int valid = 0;
+    for (std::size_t i = 0; i < lola.size(); ++i) valid += (flags[i] = isValid(lola[i])) ? 1 : 0;
+    return valid;
+}
+
+int OmbCrs::checkContinuousValidity(const OmbPointArray& lola, std::vector<bool>& values) const {
+    values.assign(lola.size(), false);
+    int valid = 0;
+    for (std::size_t i = 0; i < lola.size(); ++i) valid += (values[i] = continuousValidity(lola[i])) ? 1 : 0;
+    return valid;
+}
+
 // --- measurement ------------------------------------------------------------------
 
 bool OmbCrs::metersXY(const OmbPoint& p, double& mx, double& my) const {

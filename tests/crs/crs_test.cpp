@@ -334,3 +334,20 @@ TEST_F(Crs, DegreesMinutesAndSecondsAsText) {
     EXPECT_EQ(latitudeError("90", "0", "0.1", "S"),
               "Value \"value\" is out of range in Crs.ParseLatitude(), should be 0 to 90.");
 }
+
+TEST_F(Crs, GeocentricCoordinatesAndValidity) {
+    const OmbCrs& utm = *OmbCrs::wgs84Utm(32, OmbUTMHemisphere::North);
+    OmbPoint p(10, 50, 100);
+    utm.project(p);
+    const OmbPoint xyz = utm.unprojectToGeocentricXYZ(p);
+    EXPECT_NEAR(std::hypot(xyz.x, xyz.y, xyz.z), 6366000, 5000);
+    EXPECT_TRUE(utm.projectFromGeocentricXYZ(xyz).approxEqual(p, 1e-6));
+    std::vector<bool> flags;
+    // Polar stereographic about the north pole: the south pole has no image.
+    const OmbRef<OmbCrs> polar = OmbCrs::fromArea({-10, 80}, {10, 90}, OmbGeodeticDatum::wgs84());
+    EXPECT_EQ(polar->checkValidity(OmbPointArray{{0, 85}, {0, -90}, {0, 91}}, flags), 1);
+    EXPECT_EQ(flags, (std::vector<bool>{true, false, false}));
+    const OmbPointArray outline = utm.boundary();
+    ASSERT_GT(outline.size(), 4u);
+    EXPECT_EQ(outline.front(), outline.back());
+}

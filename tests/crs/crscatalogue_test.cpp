@@ -133,3 +133,24 @@ TEST_F(Catalogue, EveryCodeBuildsOrFailsCleanly) {
     for (const auto& [reason, count] : reasons) std::printf("  %6d  %s...\n", count, reason.c_str());
     EXPECT_GT(built, 4000);
 }
+
+TEST_F(Catalogue, LookUpsSayWhatTheCatalogueKnows) {
+    const OmbString epsg("epsg");
+    EXPECT_EQ(OmbCrs::authoritativeName(epsg, OmbString("27700")), OmbString("OSGB36 / British National Grid"));
+    EXPECT_EQ(OmbCrs::authoritativeAxisDirection(epsg, OmbString("27700"), 0), OmbCrsAxisDirection::GridEast);
+    EXPECT_EQ(OmbCrs::authoritativeAxisDirection(epsg, OmbString("4326"), 0), OmbCrsAxisDirection::North);
+    EXPECT_EQ(OmbCrs::authoritativeAxisDirection(OmbString("crs"), OmbString("84"), 0), OmbCrsAxisDirection::East);
+    EXPECT_EQ(OmbCrs::authoritativeAxisAbbreviation(epsg, OmbString("3006"), 0), OmbString("N"));
+    const OmbRect uk = OmbCrs::authoritativeAreaOfUseBounds(epsg, OmbString("27700"));
+    EXPECT_NEAR(uk.xmin, -9, 0.5);
+    EXPECT_NEAR(uk.ymax, 61, 0.5);
+    EXPECT_NE(std::string(OmbCrs::authoritativeAreaOfUseDescription(epsg, OmbString("27700"))).find("Great Britain"),
+              std::string::npos);
+    EXPECT_FALSE(OmbCrs::epsgVersion().empty());
+    EXPECT_EQ(errorOf([] { OmbCrs::authoritativeName(OmbString("esri"), OmbString("102003")); }),
+              "Unsupported authority esri; only EPSG and CRS are supported as authorities in Crs.authoritativeName.");
+    EXPECT_EQ(errorOf([] { OmbCrs::authoritativeName(OmbString("epsg"), OmbString("99")); }),
+              "The EPSG coordinate reference system code 99 is out of range; it should be between 1024 and 32767.");
+    EXPECT_EQ(errorOf([] { OmbCrs::authoritativeName(OmbString("epsg"), OmbString("1025")); }),
+              "The EPSG coordinate reference system code 1025 was not found in the catalogue.");
+}

@@ -23,9 +23,25 @@
 
 #include <memory>
 #include <mutex>
+#include <vector>
 
 enum class OmbCrsLineType { GreatCircle = 0, GreatCircleApprox = 1, RhumbLine = 2 };
 enum class OmbWellKnownTextFlavor { OgrWellKnownText = 0, EsriWellKnownText = 1 };
+// Where a catalogue system's axis points: geographic axes north, south,
+// east and west; projected axes along the grid.
+enum class OmbCrsAxisDirection {
+    North = 0,
+    South = 1,
+    East = 2,
+    West = 3,
+    Up = 4,
+    Down = 5,
+    GridNorth = 6,
+    GridSouth = 7,
+    GridEast = 8,
+    GridWest = 9,
+    UnknownDirection = 10
+};
 OMB_DESCRIBE_ENUM(OmbCrsLineType, "CrsLineType", {{"GreatCircle", 0}, {"GreatCircleApprox", 1}, {"RhumbLine", 2}})
 
 class OmbCrs : public OmbResourceObject {
@@ -95,7 +111,16 @@ public:
     void changeDatumTo(const OmbGeodeticDatum& datum, OmbPointArray& points) const {
         datum_->changeDatumTo(datum, points);
     }
+    // Projected to geocentric X, Y, Z on this datum's ellipsoid (metres),
+    // and back.
+    OmbPoint unprojectToGeocentricXYZ(const OmbPoint& p) const;
+    OmbPoint projectFromGeocentricXYZ(const OmbPoint& xyz) const;
+    // The outline of the projected world, closed.
+    OmbPointArray boundary() const { return projection_->worldPerimeter(cached_.get()); }
     bool isValid(const OmbPoint& lola) const { return projection_->isValid(lola, cached_.get()); }
+    // Flags (or continuity) per long/lat point; the number of valid points.
+    int checkValidity(const OmbPointArray& lola, std::vector<bool>& flags) const;
+    int checkContinuousValidity(const OmbPointArray& lola, std::vector<bool>& values) const;
     bool isValidProjectedPoint(const OmbPoint& p) const { return projection_->isValidProjectedPoint(p, cached_.get()); }
     bool continuousValidity(const OmbPoint& lola) const { return projection_->continuousValidity(lola, cached_.get()); }
 
@@ -197,6 +222,20 @@ public:
     static double parseLongitude(const OmbString& degrees, const OmbString& minutes, const OmbString& hemisphere);
     static double parseLongitude(const OmbString& degrees, const OmbString& minutes, const OmbString& seconds,
                                  const OmbString& hemisphere);
+
+    // --- the catalogue ------------------------------------------------------------
+    // What the EPSG catalogue says of a system: its name, the direction and
+    // abbreviation of an axis (0 or 1), its area of use. OmbXUnsupportedAuthority
+    // for an authority other than EPSG or CRS, OmbXEpsgCrsCodeOutOfRange for a
+    // code outside 1024..32767, and the "not found" error of each look-up.
+    static OmbString authoritativeName(const OmbString& authority, const OmbString& code);
+    static OmbCrsAxisDirection authoritativeAxisDirection(const OmbString& authority, const OmbString& code, int axis);
+    static OmbString authoritativeAxisAbbreviation(const OmbString& authority, const OmbString& code, int axis);
+    static OmbString authoritativeAreaOfUseDescription(const OmbString& authority, const OmbString& code);
+    // West, south, east, north in degrees; east below west across 180.
+    static OmbRect authoritativeAreaOfUseBounds(const OmbString& authority, const OmbString& code);
+    // The version of the EPSG catalogue in use.
+    static OmbString epsgVersion();
 
     static bool reasonableEpsgCode(int code);
     static bool reasonableEsriCode(int code);
