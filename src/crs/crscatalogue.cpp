@@ -293,14 +293,13 @@ OmbRef<OmbProjection> Converter::projection() const {
         origin(*r, lonC, latC);
         return named(r, "Rosenmund_EPSG_");
     }
-    if (method == SRS_PT_KROVAK && !northOriented())
-        OMB_THROW(UnsupportedProjectionType, OmbString::literal("Krovak (south-west oriented)"));
     if (method == SRS_PT_KROVAK) {
         auto* kr = new OmbKrovak;
         origin(*kr, lonC, latC);
         kr->colatitudeConeAxis(parameter(SRS_PP_AZIMUTH, 30.28813975277778));
         kr->pseudoStandardParallel(parameter(SRS_PP_PSEUDO_STD_PARALLEL_1, 78.5));
         kr->scaleFactor(k);
+        kr->northOriented(northOriented());
         return named(kr, "Krovak_EPSG_");
     }
     if (method == SRS_PT_ORTHOGRAPHIC) return named(new OmbOrthographic(lon0, lat0, feUnits, fnUnits), "Ortho_EPSG_");

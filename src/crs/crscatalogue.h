@@ -19,3 +19,6 @@ OmbRef<OmbDatumShift> Omb_catalogueShiftToWgs84(int geographicCode);
 // The catalogue's well-known text of an EPSG code ("crs" 84 and 83 as
 // EPSG 4326); empty when the catalogue lacks the code.
 OmbString Omb_catalogueWellKnownText(int epsgCode, bool pretty, bool esri);
+// A system of the S-JTSK family (EPSG 2065, 5221, 5224, 5225, 5513 to 5516,
+// ESRI 102065 to 102067; authority in lower case), or null.
+OmbRef<OmbCrs> Omb_sjtskCrs(const OmbString& authority, int code);

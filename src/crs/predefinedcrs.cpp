@@ -146,6 +146,7 @@ OmbRef<OmbCrs> OmbCrs::fromAuthorityAndCode(const OmbString& authority, const Om
                                             OmbDatumShiftChoice choice) {
     const OmbString kind = authority.toLower();
     const int number = codeNumber(code);
+    if (OmbRef<OmbCrs> sjtsk = Omb_sjtskCrs(kind, number)) return sjtsk;
     if (kind == OmbString::literal("epsg")) {
         if (!reasonableEpsgCode(number))
             OMB_THROW(RangeError, "authorityCode", "Crs.FromAuthorityAndCode( epsg, authorityCode)",

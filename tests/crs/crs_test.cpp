@@ -351,3 +351,37 @@ TEST_F(Crs, GeocentricCoordinatesAndValidity) {
     ASSERT_GT(outline.size(), 4u);
     EXPECT_EQ(outline.front(), outline.back());
 }
+
+// The S-JTSK family is built here: against PROJ with the same shifts, in
+// both orientations, on Greenwich and on Ferro.
+TEST_F(Crs, SjtskSystemsAreBuiltInternally) {
+    const char* krovak = "+proj=krovak +lat_0=49.5 +alpha=30.28813972222222 +k=0.9999 +ellps=bessel ";
+    const std::string jtsk = "+towgs84=527.9,127.6,473.35,6.392,2.9925,4.682,1.78";
+    // PROJ's TOWGS84 rotates in the position-vector sense.
+    const std::string jtsk05 = "+towgs84=572.213,85.334,461.94,4.9732,1.529,5.2484,3.5378";
+    struct Case {
+        const char* code;
+        std::string proj;
+        bool southWest;
+    };
+    const Case cases[] = {
+        {"5514", std::string(krovak) + "+lon_0=24.833333333333333 " + jtsk, false},
+        {"2065", std::string(krovak) + "+pm=ferro +lon_0=42.5 +axis=swu " + jtsk, true},
+        {"5516", std::string(krovak) + "+lon_0=24.833333333333333 " + jtsk05, false},
+    };
+    const auto points = randomPoints(5514, 300, 12, 19, 48.5, 51);
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.code);
+        const auto crs = OmbCrs::fromAuthorityAndCode(OmbString("epsg"), OmbString(c.code));
+        const auto expected = cs2cs("+proj=longlat +datum=WGS84", c.proj, points);
+        ASSERT_EQ(expected.size(), points.size()) << "cs2cs (proj-bin) is needed";
+        for (std::size_t i = 0; i < points.size(); ++i) {
+            OmbPoint p = points[i];
+            OmbCrs::wgs84LongLat()->projectTo(*crs, p);
+            const OmbPoint e = c.southWest ? OmbPoint(expected[i].y, expected[i].x) : expected[i];
+            EXPECT_LT(p.distanceTo(e), 0.01) << p.x << " " << p.y << " / " << e.x << " " << e.y;
+        }
+    }
+    EXPECT_EQ(OmbCrs::fromAuthorityAndCode(OmbString("esri"), OmbString("102066"))->name(),
+              OmbString("S_JTSK_Ferro_Krovak_East_North"));
+}

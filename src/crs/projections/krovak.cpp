@@ -2,7 +2,8 @@
 // and 1041 (Krovak North Orientated): the ellipsoid onto Gauss's conformal
 // sphere, the sphere turned to oblique coordinates about the cone's axis,
 // then a conformal cone touching at the pseudo standard parallel. Easting
-// and northing are the negated westing and southing. Exact within rounding;
+// and northing are the negated westing and southing; the south-west form
+// gives x = westing, y = southing. Exact within rounding;
 // the inverse iterates the latitude to 1e-12 rad.
 #include "projectiondescriptions.h"
 #include "projectionmath.h"
@@ -26,6 +27,9 @@ OMB_DESCRIBE_CLASS(OmbKrovak) {
         [](OmbKrovak& p, double v) { p.pseudoStandardParallel(v); }, 78.5);
     Omb_describeScaleFactor(d);
     Omb_describeFalseOrigin(d);
+    d.property<bool>(
+        "NorthOriented", [](const OmbKrovak& p) { return p.northOriented(); },
+        [](OmbKrovak& p, bool v) { p.northOriented(v); }, true);
 }
 
 namespace {
@@ -85,15 +89,17 @@ void OmbKrovak::project(OmbPoint& p, const OmbProjCachedNumbers* cached) const {
     const double D = asinSafe(std::cos(U) * std::sin(V) / std::cos(T));
     const double theta = c.n * D;
     const double r = c.r0 * c.tanP / std::pow(std::tan(T / 2 + M_PI / 4), c.n);
-    // Southing and westing, negated.
-    p.x = (-(r * std::sin(theta)) - c.falseEasting) * c.unitsPerMeter;
-    p.y = (-(r * std::cos(theta)) - c.falseNorthing) * c.unitsPerMeter;
+    // Westing and southing, negated when north oriented.
+    const double sign = northOriented_ ? -1 : 1;
+    p.x = sign * (r * std::sin(theta) + c.falseEasting) * c.unitsPerMeter;
+    p.y = sign * (r * std::cos(theta) + c.falseNorthing) * c.unitsPerMeter;
 }
 
 void OmbKrovak::unproject(OmbPoint& p, const OmbProjCachedNumbers* cached) const {
     const KrovakCachedNumbers& c = numbers(cached);
-    const double southing = -p.y * c.metersPerUnit - c.falseNorthing;
-    const double westing = -p.x * c.metersPerUnit - c.falseEasting;
+    const double sign = northOriented_ ? -1 : 1;
+    const double southing = sign * p.y * c.metersPerUnit - c.falseNorthing;
+    const double westing = sign * p.x * c.metersPerUnit - c.falseEasting;
     const double r = std::hypot(southing, westing);
     const double theta = std::atan2(westing, southing);
     const double D = theta / c.n;
@@ -121,5 +127,6 @@ void OmbKrovak::nominalMetersXY(const OmbProjCachedNumbers* cached, double& mx, 
 bool OmbKrovak::equivalent(const OmbProjection& other) const {
     if (!sameParameters(other)) return false;
     const auto& k = static_cast<const OmbKrovak&>(other);
-    return colatitudeConeAxis_ == k.colatitudeConeAxis_ && pseudoStandardParallel_ == k.pseudoStandardParallel_;
+    return colatitudeConeAxis_ == k.colatitudeConeAxis_ && pseudoStandardParallel_ == k.pseudoStandardParallel_ &&
+           northOriented_ == k.northOriented_;
 }

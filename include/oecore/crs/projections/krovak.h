@@ -1,5 +1,5 @@
-// Krovak's oblique conformal conic, north oriented (easting, northing), as
-// used in the Czech Republic and Slovakia.
+// Krovak's oblique conformal conic, as used in the Czech Republic and
+// Slovakia: north oriented (easting, northing) or south-west oriented.
 //
 // Immutable once read; shared between threads.
 #pragma once
@@ -21,6 +21,10 @@ public:
     void colatitudeConeAxis(double degrees) { colatitudeConeAxis_ = degrees; }
     double pseudoStandardParallel() const noexcept { return pseudoStandardParallel_; }
     void pseudoStandardParallel(double degrees) { pseudoStandardParallel_ = degrees; }
+    // Easting and northing (the default), or westing and southing as
+    // positive numbers (the classical Czech and Slovak grid).
+    bool northOriented() const noexcept { return northOriented_; }
+    void northOriented(bool north) { northOriented_ = north; }
 
     using OmbProjection::project;
     using OmbProjection::unproject;
@@ -36,4 +40,5 @@ public:
 private:
     double colatitudeConeAxis_ = 30.28813975277778;
     double pseudoStandardParallel_ = 78.5;
+    bool northOriented_ = true;
 };
