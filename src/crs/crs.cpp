@@ -268,18 +268,35 @@ OmbPoint OmbCrs::onMercatorPlane(const OmbPoint& lola) const {
     return {lola.x, p.y};
 }
 
-double OmbCrs::rhumbLength(const OmbPoint& from, const OmbPoint& to) const {
+double OmbCrs::rhumbLength(const OmbPoint& from, const OmbPoint& to, double* course) const {
     // Straight on the Mercator plane: the meridian arc between the
     // latitudes over the cosine of the course, or the parallel's arc.
     const double dLon = wrapLongitude(to.x - from.x);
     OmbPoint degree(1, 0);
     OmbProjection::mercator1SPEllipsoid()->project(degree, &auxMercatorNumbers());
-    const double course = std::atan2(dLon * degree.x, onMercatorPlane(to).y - onMercatorPlane(from).y);
+    const double heading = std::atan2(dLon * degree.x, onMercatorPlane(to).y - onMercatorPlane(from).y);
+    if (course) *course = heading * degreesPerRadian;
     const OmbMeriDistProjCachedNumbers arcs(*datum_, 1, 0);
     const double lat1 = from.y * radiansPerDegree, lat2 = to.y * radiansPerDegree;
     if (std::fabs(lat2 - lat1) < 1e-12)
         return std::fabs(dLon) * radiansPerDegree * arcs.primeVerticalRadius(std::sin(lat1)) * std::cos(lat1);
-    return std::fabs((arcs.meridianDistance(lat2) - arcs.meridianDistance(lat1)) / std::cos(course));
+    return std::fabs((arcs.meridianDistance(lat2) - arcs.meridianDistance(lat1)) / std::cos(heading));
+}
+
+OmbPoint OmbCrs::alongRhumbLine(const OmbPoint& from, double course, double distance) const {
+    const double c = course * radiansPerDegree;
+    const OmbMeriDistProjCachedNumbers arcs(*datum_, 1, 0);
+    const double lat1 = from.y * radiansPerDegree;
+    if (std::fabs(std::cos(c)) < 1e-12) {
+        // Along the parallel.
+        const double radius = arcs.primeVerticalRadius(std::sin(lat1)) * std::cos(lat1);
+        return {wrapLongitude(from.x + std::sin(c) * distance / radius * degreesPerRadian), from.y, from.z};
+    }
+    const double lat2 = arcs.latitudeFromMeridianDistance(arcs.meridianDistance(lat1) + distance * std::cos(c));
+    OmbPoint degree(1, 0);
+    OmbProjection::mercator1SPEllipsoid()->project(degree, &auxMercatorNumbers());
+    const double dy = onMercatorPlane({0, lat2 * degreesPerRadian}).y - onMercatorPlane(from).y;
+    return {wrapLongitude(from.x + std::tan(c) * dy / degree.x), lat2 * degreesPerRadian, from.z};
 }
 
 double OmbCrs::length2d(const OmbPointArray& points, OmbCrsLineType lineType, bool closed) const {
@@ -335,6 +352,60 @@ OmbString OmbCrs::toWellKnownText(bool pretty, OmbWellKnownTextFlavor flavor) co
     if (wkt.empty()) OMB_THROW(UnsupportedProjection);
     return wkt;
 }
+
+OmbPoint OmbCrs::pointAlongRay2d(const OmbPoint& p, double azimuth, double distance, OmbCrsLineType lineType) const {
+    if (lineType != OmbCrsLineType::RhumbLine) return pointPlusDirectedDistance(p, azimuth, distance);
+    OmbPoint q = alongRhumbLine(lola(p), azimuth, distance);
+    project(q);
+    return q;
+}
+
+OmbPoint OmbCrs::partway(const OmbPoint& a, const OmbPoint& b, double fraction, OmbCrsLineType lineType) const {
+    if (lineType != OmbCrsLineType::RhumbLine) {
+        const OmbGeodesicInverse g = distanceAndAzimuths(a, b);
+        return pointPlusDirectedDistance(a, g.azimuth, fraction * g.distance);
+    }
+    double course = 0;
+    const OmbPoint from = lola(a);
+    const double length = rhumbLength(from, lola(b), &course);
+    OmbPoint q = alongRhumbLine(from, course, fraction * length);
+    project(q);
+    return q;
+}
+
+OmbPoint OmbCrs::nearestPointOnLine2d(const OmbPointArray& line, const OmbPoint& p, std::size_t& segment) const {
+    if (line.empty()) OMB_THROW(Argument, "Crs.nearestPointOnLine2d (the line has no points)");
+    OmbPoint nearest = line[0];
+    segment = 0;
+    double best = p.distanceTo(nearest);
+    for (std::size_t i = 0; i + 1 < line.size(); ++i) {
+        const OmbPoint d = line[i + 1] - line[i];
+        const double length2 = d.dot2(d);
+        const double t = length2 > 0 ? std::clamp((p - line[i]).dot2(d) / length2, 0.0, 1.0) : 0;
+        const OmbPoint q = line[i] + d * t;
+        if (p.distanceTo(q) < best) best = p.distanceTo(q), nearest = q, segment = i;
+    }
+    return nearest;
+}
+
+bool OmbCrs::intersectLineSegments(const OmbPoint& a1, const OmbPoint& a2, const OmbPoint& b1, const OmbPoint& b2,
+                                   OmbPoint& crossing) const {
+    const OmbPoint r = a2 - a1, s = b2 - b1, w = b1 - a1;
+    const double denominator = r.x * s.y - r.y * s.x;
+    if (denominator == 0) return false;  // parallel
+    const double t = (w.x * s.y - w.y * s.x) / denominator, u = (w.x * r.y - w.y * r.x) / denominator;
+    if (t < 0 || t > 1 || u < 0 || u > 1) return false;
+    crossing = a1 + r * t;
+    return true;
+}
+
+double OmbCrs::normalizeCyclicEasting(double x) const {
+    OmbRect r(x, 0, x, 0);
+    adjustRect(r);
+    return r.xmin;
+}
+
+void OmbCrs::adjustPoint(OmbPoint& p) const { p.x = normalizeCyclicEasting(p.x); }
 
 // --- comparison -------------------------------------------------------------------
 

@@ -385,3 +385,37 @@ TEST_F(Crs, SjtskSystemsAreBuiltInternally) {
     EXPECT_EQ(OmbCrs::fromAuthorityAndCode(OmbString("esri"), OmbString("102066"))->name(),
               OmbString("S_JTSK_Ferro_Krovak_East_North"));
 }
+
+TEST_F(Crs, RaysPartwayPointsAndPlaneGeometry) {
+    const OmbCrs& lola = *OmbCrs::wgs84LongLat();
+    const OmbPoint start(-74, 40.7), end(-9.1, 38.7);
+    for (const OmbCrsLineType type : {OmbCrsLineType::GreatCircle, OmbCrsLineType::RhumbLine}) {
+        // Half way and back: the two halves have equal length and join at
+        // the end.
+        const OmbPoint middle = lola.partway(start, end, 0.5, type);
+        const double first = lola.length2d(OmbPointArray{start, middle}, type, false);
+        const double second = lola.length2d(OmbPointArray{middle, end}, type, false);
+        EXPECT_NEAR(first, second, 1e-3);
+        EXPECT_TRUE(lola.partway(start, end, 1, type).approxEqual(end, 1e-8));
+    }
+    // Due east along the rhumb line keeps the latitude; a rhumb ray reaches
+    // the point its course and length say.
+    const OmbPoint east = lola.pointAlongRay2d({10, 45}, 90, 100000, OmbCrsLineType::RhumbLine);
+    EXPECT_NEAR(east.y, 45, 1e-12);
+    EXPECT_NEAR(lola.length2d(OmbPointArray{{10, 45}, east}, OmbCrsLineType::RhumbLine, false), 100000, 1e-6);
+    const OmbPoint ray = lola.pointAlongRay2d({10, 45}, 30, 500000, OmbCrsLineType::RhumbLine);
+    EXPECT_NEAR(lola.length2d(OmbPointArray{{10, 45}, ray}, OmbCrsLineType::RhumbLine, false), 500000, 1e-6);
+
+    std::size_t segment = 9;
+    EXPECT_EQ(lola.nearestPointOnLine2d(OmbPointArray{{0, 0}, {10, 0}, {10, 10}}, {12, 4}, segment), OmbPoint(10, 4));
+    EXPECT_EQ(segment, 1u);
+    OmbPoint crossing;
+    EXPECT_TRUE(lola.intersectLineSegments({0, 0}, {4, 4}, {0, 4}, {4, 0}, crossing));
+    EXPECT_EQ(crossing, OmbPoint(2, 2));
+    EXPECT_FALSE(lola.intersectLineSegments({0, 0}, {1, 1}, {3, 0}, {4, 1}, crossing));
+    // In a cyclic world an easting a world away comes home.
+    const OmbCrs& web = *OmbCrs::wgs84MercatorWeb();
+    OmbPoint far(100000 + 2 * M_PI * 6378137, 5);
+    web.adjustPoint(far);
+    EXPECT_NEAR(far.x, 100000, 1e-6);
+}

@@ -157,8 +157,23 @@ public:
     OmbString toWellKnownText(bool pretty,
                               OmbWellKnownTextFlavor flavor = OmbWellKnownTextFlavor::OgrWellKnownText) const;
 
-    // Moves a projected rectangle of a cyclic world into the world.
+    // The projected point a ground distance (metres) from p in the azimuth
+    // (degrees), along a geodesic or a rhumb line.
+    OmbPoint pointAlongRay2d(const OmbPoint& p, double azimuth, double distance, OmbCrsLineType lineType) const;
+    // The projected point a fraction (0 to 1) of the way from a to b.
+    OmbPoint partway(const OmbPoint& a, const OmbPoint& b, double fraction, OmbCrsLineType lineType) const;
+    // In the plane of the projection: the point of a polyline nearest to p
+    // (with the index of its segment), and where two segments cross (false
+    // when they do not).
+    OmbPoint nearestPointOnLine2d(const OmbPointArray& line, const OmbPoint& p, std::size_t& segment) const;
+    bool intersectLineSegments(const OmbPoint& a1, const OmbPoint& a2, const OmbPoint& b1, const OmbPoint& b2,
+                               OmbPoint& crossing) const;
+
+    // Moves a projected rectangle or point of a cyclic world by whole world
+    // widths into the world; an easting likewise.
     void adjustRect(OmbRect& rect) const { projection_->adjustRect(rect, cached_.get()); }
+    void adjustPoint(OmbPoint& p) const;
+    double normalizeCyclicEasting(double x) const;
 
     // Same object; or both with authoritative codes whose atoms agree; or
     // equal datums and equal projections.
@@ -264,8 +279,11 @@ private:
     // Projected to long/lat on this datum; OmbXInvalidOperation for a
     // system that is not georeferenced.
     OmbPoint lola(const OmbPoint& p) const;
-    // Metres along the rhumb line between two long/lat points.
-    double rhumbLength(const OmbPoint& from, const OmbPoint& to) const;
+    // Metres along the rhumb line between two long/lat points, and its
+    // course in degrees.
+    double rhumbLength(const OmbPoint& from, const OmbPoint& to, double* course = nullptr) const;
+    // The long/lat point a distance along the rhumb line of a course.
+    OmbPoint alongRhumbLine(const OmbPoint& from, double course, double distance) const;
     // A long/lat point's y on the auxiliary Mercator plane (x keeps the
     // longitude).
     OmbPoint onMercatorPlane(const OmbPoint& lola) const;
