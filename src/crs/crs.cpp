@@ -346,9 +346,9 @@ OmbString OmbCrs::toWellKnownText(bool pretty, OmbWellKnownTextFlavor flavor) co
     if (kind == OmbString::literal("crs") &&
         (authorityCode_ == OmbString::literal("84") || authorityCode_ == OmbString::literal("83")))
         code = 4326;
-    const OmbString wkt =
-        code ? Omb_catalogueWellKnownText(code, pretty, flavor == OmbWellKnownTextFlavor::EsriWellKnownText)
-             : OmbString();
+    const bool esri = flavor == OmbWellKnownTextFlavor::EsriWellKnownText;
+    OmbString wkt = code ? Omb_catalogueWellKnownText(code, pretty, esri) : OmbString();
+    if (wkt.empty()) wkt = Omb_wellKnownTextOf(*this, pretty, esri);
     if (wkt.empty()) OMB_THROW(UnsupportedProjection);
     return wkt;
 }

@@ -388,3 +388,100 @@ OmbString Omb_catalogueWellKnownText(int epsgCode, bool pretty, bool esri) {
     CPLFree(text);
     return wkt;
 }
+
+namespace {
+
+// GDAL's TOWGS84 for a datum whose shift is a Helmert shift to WGS 84.
+void addTowgs84(OGRSpatialReference& srs, const OmbGeodeticDatum& datum) {
+    const auto* helmert = dynamic_cast<const OmbHelmertDatumShift*>(datum.datumShift().get());
+    if (!helmert || !helmert->knownDatum() || !helmert->knownDatum()->isWgs84Equivalent()) return;
+    OmbHelmertDatumShift::Parameters p = helmert->parameters();
+    double sign = p.convention == OmbRotationSignConvention::CoordinateFrameRotation ? -1 : 1;
+    if (p.direction == OmbDatumShiftDirection::FromKnownDatum) {
+        // TOWGS84 runs towards WGS 84: the small-angle inverse.
+        p.dx = -p.dx, p.dy = -p.dy, p.dz = -p.dz, p.scaleDifference = -p.scaleDifference;
+        sign = -sign;
+    }
+    srs.SetTOWGS84(p.dx, p.dy, p.dz, sign * p.rx, sign * p.ry, sign * p.rz, p.scaleDifference);
+}
+
+// The projection's definition in GDAL's terms; false for a class GDAL has
+// no method for.
+bool setProjection(OGRSpatialReference& srs, const OmbProjection& p) {
+    const double lon = p.centralLongitude(), lat = p.centralLatitude(), fe = p.falseEasting(), fn = p.falseNorthing(),
+                 k = p.scaleFactor();
+    if (dynamic_cast<const OmbTransverseMercator*>(&p) || dynamic_cast<const OmbUTM*>(&p))
+        return srs.SetTM(lat, lon, k, fe, fn) == OGRERR_NONE;
+    if (dynamic_cast<const OmbMiller*>(&p)) return false;
+    if (const auto* m = dynamic_cast<const OmbMercator*>(&p))
+        return (m->standardParallel() != 0 ? srs.SetMercator2SP(m->standardParallel(), 0, lon, fe, fn)
+                                           : srs.SetMercator(0, lon, k, fe, fn)) == OGRERR_NONE;
+    if (const auto* l = dynamic_cast<const OmbLambertConformalConic2SP*>(&p))
+        return (l->standardParallel1() == l->standardParallel2()
+                    ? srs.SetLCC1SP(lat, lon, k, fe, fn)
+                    : srs.SetLCC(l->standardParallel1(), l->standardParallel2(), lat, lon, fe, fn)) == OGRERR_NONE;
+    if (const auto* a = dynamic_cast<const OmbAlbersEqualAreaConic*>(&p))
+        return srs.SetACEA(a->standardParallel1(), a->standardParallel2(), lat, lon, fe, fn) == OGRERR_NONE;
+    if (dynamic_cast<const OmbAzimuthalEqualArea*>(&p)) return srs.SetLAEA(lat, lon, fe, fn) == OGRERR_NONE;
+    if (dynamic_cast<const OmbAzimuthalEquidistant*>(&p)) return srs.SetAE(lat, lon, fe, fn) == OGRERR_NONE;
+    if (dynamic_cast<const OmbCassiniSoldner*>(&p)) return srs.SetCS(lat, lon, fe, fn) == OGRERR_NONE;
+    if (const auto* h = dynamic_cast<const OmbHotineObliqueMercator*>(&p))
+        return (h->trueOrigin() == OmbHotineObliqueMercatorTrueOrigin::CentralPoint
+                    ? srs.SetHOMAC(lat, lon, h->azimuth(), h->rectifiedGridAngle(), k, fe, fn)
+                    : srs.SetHOM(lat, lon, h->azimuth(), h->rectifiedGridAngle(), k, fe, fn)) == OGRERR_NONE;
+    if (const auto* l = dynamic_cast<const OmbLabordeObliqueMercator*>(&p))
+        return srs.SetLOM(lat, lon, l->azimuth(), k, fe, fn) == OGRERR_NONE;
+    if (dynamic_cast<const OmbRosenmundObliqueMercator*>(&p)) return srs.SetSOC(lat, lon, fe, fn) == OGRERR_NONE;
+    if (const auto* kr = dynamic_cast<const OmbKrovak*>(&p))
+        return kr->northOriented() && srs.SetKrovak(lat, lon, kr->colatitudeConeAxis(), kr->pseudoStandardParallel(), k,
+                                                    fe, fn) == OGRERR_NONE;
+    if (dynamic_cast<const OmbOrthographic*>(&p)) return srs.SetOrthographic(lat, lon, fe, fn) == OGRERR_NONE;
+    if (const auto* st = dynamic_cast<const OmbStereographic*>(&p))
+        return (st->variant() == OmbStereographicVariant::International
+                    ? srs.SetOS(lat, lon, k, fe, fn)
+                    : srs.SetStereographic(lat, lon, k, fe, fn)) == OGRERR_NONE;
+    if (const auto* ps = dynamic_cast<const OmbPolarStereographic*>(&p))
+        return (ps->standardParallel() != 0 ? srs.SetPS(ps->standardParallel(), lon, 1, fe, fn)
+                                            : srs.SetPS(ps->northPole() ? 90 : -90, lon, k, fe, fn)) == OGRERR_NONE;
+    if (const auto* e = dynamic_cast<const OmbEquidistantCylindrical*>(&p))
+        return srs.SetEquirectangular2(lat, lon, e->standardParallel(), fe, fn) == OGRERR_NONE;
+    if (dynamic_cast<const OmbNewZealandMapGrid*>(&p)) return srs.SetNZMG(-41, 173, 2510000, 6023150) == OGRERR_NONE;
+    return false;
+}
+
+}  // namespace
+
+OmbString Omb_wellKnownTextOf(const OmbCrs& crs, bool pretty, bool esri) {
+    const QuietGdal quiet;
+    OGRSpatialReference srs;
+    const OmbProjection& projection = *crs.projection();
+    const OmbGeodeticDatum& datum = *crs.geodeticDatum();
+    const std::string name(crs.name().empty() ? OmbString::literal("with unknown name") : crs.name());
+    if (!projection.georeferenced()) {
+        srs.SetLocalCS(name.c_str());
+    } else {
+        const bool longLat = dynamic_cast<const OmbLoLa*>(&projection) != nullptr;
+        if (!longLat) {
+            srs.SetProjCS(name.c_str());
+            const OmbLengthUnit& unit = *projection.lengthUnit();
+            srs.SetLinearUnits(
+                unit.inMeters() == 1 ? "metre" : (unit.name().empty() ? "unit" : std::string(unit.name()).c_str()),
+                unit.inMeters());
+            if (!setProjection(srs, projection)) return {};
+        }
+        const std::string datumName(datum.name().empty() ? OmbString::literal("unknown") : datum.name());
+        const std::string geographic = longLat ? name : datumName;
+        const std::string meridian = datum.primeMeridianDegrees() == 0 ? "Greenwich" : "Reference meridian";
+        srs.SetGeogCS(geographic.c_str(), datumName.c_str(), "ellipsoid", datum.ellipsoid()->equatorialRadius(),
+                      datum.ellipsoid()->inverseFlattening(), meridian.c_str(), datum.primeMeridianDegrees());
+        addTowgs84(srs, datum);
+    }
+    if (esri) srs.morphToESRI();
+    const char* options[] = {pretty ? "MULTILINE=YES" : "MULTILINE=NO", esri ? "FORMAT=WKT1_ESRI" : "FORMAT=WKT1",
+                             nullptr};
+    char* text = nullptr;
+    const bool written = srs.exportToWkt(&text, options) == OGRERR_NONE && text;
+    const OmbString wkt(written ? text : "");
+    CPLFree(text);
+    return wkt;
+}

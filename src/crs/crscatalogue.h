@@ -22,3 +22,7 @@ OmbString Omb_catalogueWellKnownText(int epsgCode, bool pretty, bool esri);
 // A system of the S-JTSK family (EPSG 2065, 5221, 5224, 5225, 5513 to 5516,
 // ESRI 102065 to 102067; authority in lower case), or null.
 OmbRef<OmbCrs> Omb_sjtskCrs(const OmbString& authority, int code);
+// The well-known text of any system GDAL has the methods for, built from
+// its parameters; empty for the others (rotated, recentred, polynomial,
+// dynamic local, Miller, angular and south-west Krovak planes).
+OmbString Omb_wellKnownTextOf(const OmbCrs& crs, bool pretty, bool esri);

@@ -2,6 +2,11 @@
 // same definitions, and the walk over every code the catalogue knows.
 #include <oecore/core/exception.h>
 #include <oecore/crs/crs.h>
+#include <oecore/crs/projections/azimuthal.h>
+#include <oecore/crs/projections/lambertconformalconic.h>
+#include <oecore/crs/projections/projlibprojections.h>
+#include <oecore/crs/projections/transversemercator.h>
+#include <oecore/crs/projections/wrappedprojections.h>
 
 #include <gtest/gtest.h>
 
@@ -154,4 +159,51 @@ TEST_F(Catalogue, LookUpsSayWhatTheCatalogueKnows) {
               "The EPSG coordinate reference system code 99 is out of range; it should be between 1024 and 32767.");
     EXPECT_EQ(errorOf([] { OmbCrs::authoritativeName(OmbString("epsg"), OmbString("1025")); }),
               "The EPSG coordinate reference system code 1025 was not found in the catalogue.");
+}
+
+// Systems without a code write their own well-known text, which reads
+// back into the same conversions, datum shift included.
+TEST_F(Catalogue, WellKnownTextOfCustomSystemsReadsBack) {
+    OmbHelmertDatumShift::Parameters helmert;
+    helmert.dx = 446.448, helmert.dy = -125.157, helmert.dz = 542.06;
+    helmert.rx = 0.15, helmert.ry = 0.247, helmert.rz = 0.842, helmert.scaleDifference = -20.489;
+    OmbRef<OmbHelmertDatumShift> shift(new OmbHelmertDatumShift);
+    shift->parameters(helmert);
+    OmbRef<OmbGeodeticDatum> osgb(new OmbGeodeticDatum(OmbEllipsoid::airy1830(), OmbPrimeMeridian::greenwich(), shift));
+    osgb->name(OmbString("OSGB36"));
+    OmbRef<OmbPolarStereographic> polar(new OmbPolarStereographic(false));
+    polar->standardParallel(-71);
+    OmbRef<OmbAlbersEqualAreaConic> albers(new OmbAlbersEqualAreaConic);
+    albers->centralLongitude(-96), albers->centralLatitude(23);
+    albers->standardParallel1(29.5), albers->standardParallel2(45.5);
+    const std::pair<OmbRef<OmbProjection>, OmbPoint> cases[] = {
+        {OmbRef<OmbProjection>(new OmbTransverseMercator(-2, 49, 400000, -100000, 0.9996012717)), {-1, 52}},
+        {OmbRef<OmbProjection>(new OmbLambertConformalConic2SP(3, 46.5, 44, 49, 700000, 6600000)), {2, 47}},
+        {OmbRef<OmbProjection>(polar), {20, -75}},
+        {OmbRef<OmbProjection>(albers), {-100, 40}},
+        {OmbRef<OmbProjection>(new OmbStereographic(5.4, 52.2, 0.9999, OmbStereographicVariant::International)),
+         {6, 52}},
+        {OmbProjection::longLat(), {-2, 53}},
+    };
+    for (const auto& [projection, lola] : cases) {
+        SCOPED_TRACE(projection->myRuntimeClassName());
+        const OmbCrs crs(projection, osgb);
+        const OmbString wkt = crs.toWellKnownText(false);
+        const auto back = OmbCrs::fromWellKnownText(wkt);
+        OmbPoint ours = lola, theirs = lola;
+        crs.projectTo(*OmbCrs::wgs84LongLat(), ours);
+        back->projectTo(*OmbCrs::wgs84LongLat(), theirs);
+        EXPECT_TRUE(ours.approxEqual(theirs, 1e-9)) << std::string(wkt);
+        OmbPoint a = lola, b = lola;
+        crs.project(a);
+        back->project(b);
+        EXPECT_TRUE(a.approxEqual(b, 1e-6)) << std::string(wkt);
+    }
+    EXPECT_EQ(
+        errorOf([] {
+            OmbCrs(OmbRef<OmbProjection>(new OmbRotatedProjection(OmbProjection::utm(1, OmbUTMHemisphere::North), 5)),
+                   OmbGeodeticDatum::wgs84())
+                .toWellKnownText(false);
+        }),
+        "Failed to write Ombravel CRS instance as Well-Known Text.");
 }

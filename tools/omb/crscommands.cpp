@@ -118,7 +118,7 @@ int describeCrs(const Options& options) {
     try {
         std::cout << crs->toWellKnownText(true) << "\n";
     } catch (const OmbXUnsupportedProjection&) {
-        std::cout << "(no well-known text: the system has no catalogue code)\n";
+        std::cout << "(no well-known text: it has no method for this projection)\n";
     }
     return 0;
 }

@@ -153,7 +153,9 @@ public:
         return route(a, b, OmbCrsLineType::GreatCircle, maxSegmentLength);
     }
     // The catalogue's well-known text for a system with an EPSG or "crs"
-    // code; OmbXUnsupportedProjection for a system without one.
+    // code, else one built from the projection and datum (with the Helmert
+    // shift as TOWGS84); OmbXUnsupportedProjection for a projection the
+    // text has no method for.
     OmbString toWellKnownText(bool pretty,
                               OmbWellKnownTextFlavor flavor = OmbWellKnownTextFlavor::OgrWellKnownText) const;
 
