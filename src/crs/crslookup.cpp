@@ -1,30 +1,17 @@
 // What the EPSG catalogue (PROJ's database) says of a system.
+#include "projhandles.h"
+
 #include <oecore/core/exception.h>
 #include <oecore/crs/crs.h>
 
-#include <proj.h>
-
 #include <cstdlib>
 #include <cstring>
-#include <memory>
 #include <string>
 
 namespace {
 
-struct ContextDeleter {
-    void operator()(PJ_CONTEXT* c) const { proj_context_destroy(c); }
-};
-struct ObjectDeleter {
-    void operator()(PJ* p) const { proj_destroy(p); }
-};
-using Context = std::unique_ptr<PJ_CONTEXT, ContextDeleter>;
-using Object = std::unique_ptr<PJ, ObjectDeleter>;
-
-Context quietContext() {
-    Context context(proj_context_create());
-    proj_log_level(context.get(), PJ_LOG_NONE);
-    return context;
-}
+using Context = OmbProjContext;
+using Object = OmbProjObject;
 
 // The system of an EPSG or CRS code, null when the catalogue lacks it; the
 // authority and range errors name the look-up.
@@ -59,14 +46,14 @@ bool axisInfo(PJ_CONTEXT* context, const OmbString& authority, const OmbString& 
 }  // namespace
 
 OmbString OmbCrs::authoritativeName(const OmbString& authority, const OmbString& code) {
-    const Context context = quietContext();
+    const Context context = Omb_quietProjContext();
     const Object crs = find(context.get(), authority, code, "Crs.authoritativeName");
     if (!crs) OMB_THROW(EpsgCrsCodeNotFound, code);
     return OmbString(proj_get_name(crs.get()));
 }
 
 OmbCrsAxisDirection OmbCrs::authoritativeAxisDirection(const OmbString& authority, const OmbString& code, int axis) {
-    const Context context = quietContext();
+    const Context context = Omb_quietProjContext();
     const char* direction = nullptr;
     bool projected = false;
     if (!axisInfo(context.get(), authority, code, axis, "Crs.authoritativeAxisDirection", nullptr, &direction,
@@ -84,7 +71,7 @@ OmbCrsAxisDirection OmbCrs::authoritativeAxisDirection(const OmbString& authorit
 }
 
 OmbString OmbCrs::authoritativeAxisAbbreviation(const OmbString& authority, const OmbString& code, int axis) {
-    const Context context = quietContext();
+    const Context context = Omb_quietProjContext();
     const char* abbreviation = nullptr;
     bool projected = false;
     if (!axisInfo(context.get(), authority, code, axis, "Crs.authoritativeAxisAbbreviation", &abbreviation, nullptr,
@@ -94,7 +81,7 @@ OmbString OmbCrs::authoritativeAxisAbbreviation(const OmbString& authority, cons
 }
 
 OmbString OmbCrs::authoritativeAreaOfUseDescription(const OmbString& authority, const OmbString& code) {
-    const Context context = quietContext();
+    const Context context = Omb_quietProjContext();
     const Object crs = find(context.get(), authority, code, "Crs.authoritativeAreaOfUseDescription");
     const char* description = nullptr;
     if (!crs || !proj_get_area_of_use(context.get(), crs.get(), nullptr, nullptr, nullptr, nullptr, &description))
@@ -103,7 +90,7 @@ OmbString OmbCrs::authoritativeAreaOfUseDescription(const OmbString& authority, 
 }
 
 OmbRect OmbCrs::authoritativeAreaOfUseBounds(const OmbString& authority, const OmbString& code) {
-    const Context context = quietContext();
+    const Context context = Omb_quietProjContext();
     const Object crs = find(context.get(), authority, code, "Crs.authoritativeAreaOfUseBounds");
     double west, south, east, north;
     if (!crs || !proj_get_area_of_use(context.get(), crs.get(), &west, &south, &east, &north, nullptr) || west == -1000)
@@ -112,7 +99,7 @@ OmbRect OmbCrs::authoritativeAreaOfUseBounds(const OmbString& authority, const O
 }
 
 OmbString OmbCrs::epsgVersion() {
-    const Context context = quietContext();
+    const Context context = Omb_quietProjContext();
     const char* version = proj_context_get_database_metadata(context.get(), "EPSG.VERSION");
     return OmbString(version ? version : "");
 }

@@ -1,13 +1,11 @@
 // Datum shifts built from the EPSG catalogue in PROJ's database.
-#include <oecore/core/exception.h>
 #include "crscatalogue.h"
+#include "projhandles.h"
 
+#include <oecore/core/exception.h>
 #include <oecore/crs/datumshift.h>
 
-#include <proj.h>
-
 #include <cstring>
-#include <memory>
 #include <string>
 
 namespace {
@@ -20,15 +18,8 @@ bool isTranslation(int method) { return method == 1031 || method == 9603 || meth
 bool isPositionVector(int method) { return method == 1033 || method == 9606 || method == 1037; }
 bool isCoordinateFrame(int method) { return method == 1032 || method == 9607 || method == 1038; }
 
-// PROJ objects released with their owner.
-struct ContextDeleter {
-    void operator()(PJ_CONTEXT* c) const { proj_context_destroy(c); }
-};
-struct ObjectDeleter {
-    void operator()(PJ* p) const { proj_destroy(p); }
-};
-using Context = std::unique_ptr<PJ_CONTEXT, ContextDeleter>;
-using Object = std::unique_ptr<PJ, ObjectDeleter>;
+using Context = OmbProjContext;
+using Object = OmbProjObject;
 
 [[noreturn]] void unsupported(const OmbDatumShiftInfo& info, const std::string& why) {
     OMB_THROW(UnsupportedDatumShiftCode, info.authority + ":" + info.authorityCode + " (" + OmbString(why) + ")");
@@ -46,8 +37,7 @@ bool onWgs84(PJ_CONTEXT* context, PJ* crs) {
 OmbRef<OmbDatumShift> OmbDatumShift::fromInfo(const OmbRef<OmbDatumShiftInfo>& info) {
     if (!info) OMB_THROW(NullValue, "info", "DatumShift.fromInfo");
     if (info->authority.toLower() != OmbString::literal("epsg")) unsupported(*info, "not an EPSG code");
-    const Context context(proj_context_create());
-    proj_log_level(context.get(), PJ_LOG_NONE);  // failures become exceptions
+    const Context context = Omb_quietProjContext();
     const std::string code(info->authorityCode);
     const Object operation(
         proj_create_from_database(context.get(), "EPSG", code.c_str(), PJ_CATEGORY_COORDINATE_OPERATION, 0, nullptr));
@@ -99,8 +89,7 @@ OmbRef<OmbDatumShift> OmbDatumShift::fromInfo(const OmbRef<OmbDatumShiftInfo>& i
 }
 
 OmbRef<OmbDatumShift> Omb_catalogueShiftToWgs84(int geographicCode) {
-    const Context context(proj_context_create());
-    proj_log_level(context.get(), PJ_LOG_NONE);
+    const Context context = Omb_quietProjContext();
     const std::string code = std::to_string(geographicCode);
     const Object source(proj_create_from_database(context.get(), "EPSG", code.c_str(), PJ_CATEGORY_CRS, 0, nullptr));
     const Object target(proj_create_from_database(context.get(), "EPSG", "4326", PJ_CATEGORY_CRS, 0, nullptr));

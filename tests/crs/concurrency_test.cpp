@@ -17,6 +17,7 @@
 #include "../core/tempdir.h"
 #include "../runtimescope.h"
 #include "gridfiles.h"
+#include "testdatums.h"
 
 namespace {
 
@@ -42,19 +43,10 @@ protected:
 };
 
 TEST_F(SharedByThreads, HelmertMatricesAreBuiltOnceForAllThreads) {
-    const auto datum = [] {
-        OmbHelmertDatumShift::Parameters p;
-        p.dx = 446.448, p.dy = -125.157, p.dz = 542.06, p.rx = 0.15, p.ry = 0.247, p.rz = 0.842;
-        p.scaleDifference = -20.489;
-        OmbRef<OmbHelmertDatumShift> shift(new OmbHelmertDatumShift);
-        shift->parameters(p);
-        return OmbRef<OmbGeodeticDatum>(
-            new OmbGeodeticDatum(OmbEllipsoid::airy1830(), OmbPrimeMeridian::greenwich(), shift));
-    };
     OmbPoint expected(-2, 53, 100);
-    datum()->changeDatumTo(*OmbGeodeticDatum::wgs84(), expected);
+    osgb36()->changeDatumTo(*OmbGeodeticDatum::wgs84(), expected);
 
-    const auto shared = datum();  // its matrices not built yet
+    const auto shared = osgb36();  // its matrices not built yet
     EXPECT_EQ(differingResults(
                   [&] {
                       OmbPoint p(-2, 53, 100);

@@ -15,20 +15,11 @@
 #include "../runtimescope.h"
 #include "projectiontest.h"
 #include "referencetool.h"
+#include "testdatums.h"
 
 namespace {
 
 class Crs : public RuntimeScope {};
-
-OmbRef<OmbGeodeticDatum> osgb36() {
-    OmbHelmertDatumShift::Parameters p;
-    p.dx = 446.448, p.dy = -125.157, p.dz = 542.06, p.rx = 0.15, p.ry = 0.247, p.rz = 0.842;
-    p.scaleDifference = -20.489;
-    OmbRef<OmbHelmertDatumShift> shift(new OmbHelmertDatumShift);
-    shift->parameters(p);
-    return OmbRef<OmbGeodeticDatum>(
-        new OmbGeodeticDatum(OmbEllipsoid::airy1830(), OmbPrimeMeridian::greenwich(), shift));
-}
 
 OmbRef<OmbCrs> britishNationalGrid() {
     return OmbRef<OmbCrs>(

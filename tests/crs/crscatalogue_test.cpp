@@ -20,6 +20,7 @@
 #include "../runtimescope.h"
 #include "projectiontest.h"
 #include "referencetool.h"
+#include "testdatums.h"
 
 namespace {
 
@@ -164,13 +165,7 @@ TEST_F(Catalogue, LookUpsSayWhatTheCatalogueKnows) {
 // Systems without a code write their own well-known text, which reads
 // back into the same conversions, datum shift included.
 TEST_F(Catalogue, WellKnownTextOfCustomSystemsReadsBack) {
-    OmbHelmertDatumShift::Parameters helmert;
-    helmert.dx = 446.448, helmert.dy = -125.157, helmert.dz = 542.06;
-    helmert.rx = 0.15, helmert.ry = 0.247, helmert.rz = 0.842, helmert.scaleDifference = -20.489;
-    OmbRef<OmbHelmertDatumShift> shift(new OmbHelmertDatumShift);
-    shift->parameters(helmert);
-    OmbRef<OmbGeodeticDatum> osgb(new OmbGeodeticDatum(OmbEllipsoid::airy1830(), OmbPrimeMeridian::greenwich(), shift));
-    osgb->name(OmbString("OSGB36"));
+    const OmbRef<OmbGeodeticDatum> osgb = osgb36();
     OmbRef<OmbPolarStereographic> polar(new OmbPolarStereographic(false));
     polar->standardParallel(-71);
     OmbRef<OmbAlbersEqualAreaConic> albers(new OmbAlbersEqualAreaConic);

@@ -14,28 +14,11 @@
 #include "../errortext.h"
 #include "../runtimescope.h"
 #include "referencetool.h"
+#include "testdatums.h"
 
 namespace {
 
 class Datums : public RuntimeScope {};
-
-OmbRef<OmbGeodeticDatum> helmertDatum(const OmbRef<OmbEllipsoid>& ellipsoid, const OmbHelmertDatumShift::Parameters& p,
-                                      const char* name = "D") {
-    OmbRef<OmbHelmertDatumShift> shift(new OmbHelmertDatumShift);
-    shift->parameters(p);
-    OmbRef<OmbGeodeticDatum> datum(new OmbGeodeticDatum(ellipsoid, OmbPrimeMeridian::greenwich(), shift));
-    datum->name(OmbString(name));
-    return datum;
-}
-
-// OSGB 36 to WGS 84 (EPSG 1314, position vector).
-OmbHelmertDatumShift::Parameters osgb() {
-    OmbHelmertDatumShift::Parameters p;
-    p.dx = 446.448, p.dy = -125.157, p.dz = 542.06;
-    p.rx = 0.15, p.ry = 0.247, p.rz = 0.842;
-    p.scaleDifference = -20.489;
-    return p;
-}
 
 std::vector<OmbPoint> britishPoints() {
     std::mt19937 random(1314);
@@ -52,8 +35,8 @@ TEST_F(Datums, HelmertAgreesWithProjInBothConventionsAndReturnsExactly) {
     const auto expected = cs2cs("+proj=longlat +ellps=airy +towgs84=446.448,-125.157,542.06,0.15,0.247,0.842,-20.489",
                                 "+proj=longlat +datum=WGS84", points);
     ASSERT_EQ(expected.size(), points.size()) << "cs2cs (proj-bin) is needed";
-    const auto pv = helmertDatum(OmbEllipsoid::airy1830(), osgb());
-    OmbHelmertDatumShift::Parameters cf = osgb();
+    const auto pv = helmertDatum(OmbEllipsoid::airy1830(), osgb36Parameters());
+    OmbHelmertDatumShift::Parameters cf = osgb36Parameters();
     cf.rx = -cf.rx, cf.ry = -cf.ry, cf.rz = -cf.rz;
     cf.convention = OmbRotationSignConvention::CoordinateFrameRotation;
     const auto frame = helmertDatum(OmbEllipsoid::airy1830(), cf);
@@ -77,7 +60,7 @@ TEST_F(Datums, TwoHelmertShiftsToOneDatumComposeIntoOneStep) {
     OmbHelmertDatumShift::Parameters ed50;
     ed50.dx = -87, ed50.dy = -98, ed50.dz = -121;
     const auto a = helmertDatum(OmbEllipsoid::international1924(), ed50, "ED50");
-    const auto b = helmertDatum(OmbEllipsoid::airy1830(), osgb(), "OSGB36");
+    const auto b = helmertDatum(OmbEllipsoid::airy1830(), osgb36Parameters(), "OSGB36");
     OmbPoint direct(-1.5, 52.5, 10);
     a->changeDatumTo(*b, direct);
     OmbPoint viaPivot(-1.5, 52.5, 10);
@@ -125,7 +108,7 @@ TEST_F(Datums, OtherShiftsAndTheWalk) {
 }
 
 TEST_F(Datums, ArraysConvertLikeTheirPoints) {
-    const auto osgb36 = helmertDatum(OmbEllipsoid::airy1830(), osgb(), "OSGB36");
+    const auto osgb36 = helmertDatum(OmbEllipsoid::airy1830(), osgb36Parameters(), "OSGB36");
     OmbRef<OmbLoLaOffsetsDatumShift> offsets(new OmbLoLaOffsetsDatumShift);
     offsets->longitudeOffset = 0.5;
     OmbGeodeticDatum shifted(OmbEllipsoid::airy1830(), OmbPrimeMeridian::greenwich(), offsets);
@@ -142,7 +125,7 @@ TEST_F(Datums, ArraysConvertLikeTheirPoints) {
 }
 
 TEST_F(Datums, RectanglesCoverEveryConvertedPoint) {
-    const auto osgb36 = helmertDatum(OmbEllipsoid::airy1830(), osgb());
+    const auto osgb36 = helmertDatum(OmbEllipsoid::airy1830(), osgb36Parameters());
     const OmbRect in(-6, 50, 2, 58);
     OmbRect out;
     ASSERT_TRUE(osgb36->changeDatumTo(*OmbGeodeticDatum::wgs84(), in, out));
@@ -195,7 +178,7 @@ TEST_F(Datums, DatumsReadFromConfigurations) {
         {}, OmbDataSetInitialization::Delayed, {});
     const auto read = omb_dynamic_cast<OmbGeodeticDatum>(c->getPublicObject(OmbString("OSGB36")));
     ASSERT_TRUE(read);
-    const auto made = helmertDatum(OmbEllipsoid::airy1830(), osgb());
+    const auto made = helmertDatum(OmbEllipsoid::airy1830(), osgb36Parameters());
     OmbPoint a(-2, 53, 100), b(-2, 53, 100);
     read->changeDatumTo(*OmbGeodeticDatum::wgs84(), a);
     made->changeDatumTo(*OmbGeodeticDatum::wgs84(), b);
@@ -235,7 +218,7 @@ TEST_F(Datums, ShiftsAreBuiltFromTheEpsgCatalogue) {
         return h ? h->parameters() : OmbHelmertDatumShift::Parameters();
     };
     const auto osgbShift = fromCode("EPSG", "1314");
-    EXPECT_EQ(helmert(osgbShift), osgb());
+    EXPECT_EQ(helmert(osgbShift), osgb36Parameters());
     EXPECT_EQ(osgbShift->authorityCode(), OmbString("1314"));
     EXPECT_EQ(osgbShift->info()->authorityCode, OmbString("1314"));
     const auto belgian = helmert(fromCode("epsg", "15929"));
