@@ -168,6 +168,12 @@ TEST_F(Crs, AreasGetAFittingProjection) {
     EXPECT_TRUE(north->northPole());
     EXPECT_FALSE(
         omb_dynamic_cast<OmbPolarStereographic>(OmbCrs::recommendedProjection({0, -90}, {10, -80}))->northPole());
+    const auto recentred = OmbCrs::wgs84MercatorWeb()->recenteredClone(15);
+    EXPECT_EQ(recentred->name(), OmbString("Wgs84MercatorWebRecentered"));
+    OmbPoint origin(15, 0);
+    recentred->project(origin);
+    EXPECT_NEAR(origin.x, 0, 1e-6);
+    EXPECT_NEAR(origin.y, 0, 1e-6);
     const auto fitted = OmbCrs::fromArea({5, 55}, {25, 70}, OmbGeodeticDatum::wgs84());
     OmbPoint centre(15, 62.5);
     fitted->project(centre);
