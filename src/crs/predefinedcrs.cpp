@@ -3,7 +3,6 @@
 
 #include <oecore/core/exception.h>
 #include <oecore/core/runtime.h>
-#include <oecore/core/stringbuilder.h>
 #include <oecore/crs/crs.h>
 #include <oecore/crs/projections/identity.h>
 
@@ -31,12 +30,6 @@ OmbRef<OmbCrs> make(const char* name, const OmbRef<OmbProjection>& projection, c
 OmbRef<OmbCrs> registered(OmbRef<OmbCrs> crs) {
     OmbRuntime::registerPredefined(OmbString::literal("Crs.") + crs->name(), OmbRef<OmbEngineObject>(crs));
     return crs;
-}
-
-OmbString text(int value) {
-    OmbStringBuilder b;
-    b << value;
-    return b.str();
 }
 
 // A code as a number; 0 when it is none.
@@ -96,7 +89,7 @@ void OmbCrs::createPredefined() {
             const int code = (hemisphere == OmbUTMHemisphere::North ? 32600 : 32700) + zone;
             const std::string name = "Wgs84" + std::string(utm->name());
             p.utm[int(hemisphere)][zone - 1] =
-                registered(make(name.c_str(), utm, "epsg", std::string(text(code)).c_str()));
+                registered(make(name.c_str(), utm, "epsg", std::to_string(code).c_str()));
         }
 }
 
