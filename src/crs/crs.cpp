@@ -232,24 +232,29 @@ double OmbCrs::crsUnitsFromMetersNominally(double meters) const {
     return meters / ((mx + my) / 2);
 }
 
-OmbPoint OmbCrs::lola(const OmbPoint& p) const {
-    if (!projection_->georeferenced()) OMB_THROW(InvalidOperation, "Crs.distance() with non-georeferenced projection.");
+OmbPoint OmbCrs::lola(const OmbPoint& p, const char* operation) const {
+    if (!projection_->georeferenced())
+        OMB_THROW(InvalidOperation, OmbString(operation) + OmbString::literal(" with non-georeferenced projection."));
     OmbPoint q = p;
     unproject(q);
     return q;
 }
 
-OmbGeodesicInverse OmbCrs::distanceAndAzimuths(const OmbPoint& a, const OmbPoint& b) const {
+OmbGeodesicInverse OmbCrs::geodesic(const OmbPoint& from, const OmbPoint& to) const {
     const OmbEllipsoid& ellipsoid = *datum_->ellipsoid();
-    const OmbPoint from = lola(a), to = lola(b);
     OmbGeodesicInverse g = Omb_distanceAndAzimuthsVincenty(ellipsoid, from, to);
     return g.converged ? g : Omb_distanceAndAzimuthsExact(ellipsoid, from, to);
+}
+
+OmbGeodesicInverse OmbCrs::distanceAndAzimuths(const OmbPoint& a, const OmbPoint& b) const {
+    return geodesic(lola(a, "Crs.Distance()"), lola(b, "Crs.Distance()"));
 }
 
 double OmbCrs::distance(const OmbPoint& a, const OmbPoint& b) const { return distanceAndAzimuths(a, b).distance; }
 
 OmbPoint OmbCrs::pointPlusDirectedDistance(const OmbPoint& p, double azimuth, double distance) const {
-    OmbPoint q = Omb_pointPlusDirectedDistance(*datum_->ellipsoid(), lola(p), azimuth, distance);
+    OmbPoint q = Omb_pointPlusDirectedDistance(*datum_->ellipsoid(), lola(p, "Crs.PointPlusDirectedDistance()"),
+                                               azimuth, distance);
     project(q);
     return q;
 }
@@ -305,7 +310,9 @@ double OmbCrs::length2d(const OmbPointArray& points, OmbCrsLineType lineType, bo
     for (std::size_t i = 0; n > 1 && i < (closed ? n : n - 1); ++i) {
         const OmbPoint& a = points[i];
         const OmbPoint& b = points[(i + 1) % n];
-        length += lineType == OmbCrsLineType::RhumbLine ? rhumbLength(lola(a), lola(b)) : distance(a, b);
+        length += lineType == OmbCrsLineType::RhumbLine
+                      ? rhumbLength(lola(a, "Crs.Length2d()"), lola(b, "Crs.Length2d()"))
+                      : distance(a, b);
     }
     return length;
 }
@@ -315,11 +322,12 @@ OmbPointArray OmbCrs::route(const OmbPoint& a, const OmbPoint& b, OmbCrsLineType
     if (lineType == OmbCrsLineType::GreatCircleApprox) OMB_THROW(GreatCircleApproxRouteNotImplemented, crsName(*this));
     OmbPointArray nodes;
     if (lineType == OmbCrsLineType::GreatCircle) {
-        nodes = Omb_geodesicRoute(*datum_->ellipsoid(), lola(a), lola(b), maxSegmentLength);
+        nodes =
+            Omb_geodesicRoute(*datum_->ellipsoid(), lola(a, "Crs.Route()"), lola(b, "Crs.Route()"), maxSegmentLength);
     } else {
         // Equal steps along the straight line on the Mercator plane, the
         // shorter way round in longitude.
-        const OmbPoint from = lola(a), to = lola(b);
+        const OmbPoint from = lola(a, "Crs.Route()"), to = lola(b, "Crs.Route()");
         const double length = rhumbLength(from, to);
         if (!(maxSegmentLength > 0) || !(length / maxSegmentLength < 1e6))
             OMB_THROW(Argument, "route (maxSegmentLength must be positive)");
@@ -355,7 +363,7 @@ OmbString OmbCrs::toWellKnownText(bool pretty, OmbWellKnownTextFlavor flavor) co
 
 OmbPoint OmbCrs::pointAlongRay2d(const OmbPoint& p, double azimuth, double distance, OmbCrsLineType lineType) const {
     if (lineType != OmbCrsLineType::RhumbLine) return pointPlusDirectedDistance(p, azimuth, distance);
-    OmbPoint q = alongRhumbLine(lola(p), azimuth, distance);
+    OmbPoint q = alongRhumbLine(lola(p, "Crs.PointAlongRay2d()"), azimuth, distance);
     project(q);
     return q;
 }
@@ -366,8 +374,8 @@ OmbPoint OmbCrs::partway(const OmbPoint& a, const OmbPoint& b, double fraction, 
         return pointPlusDirectedDistance(a, g.azimuth, fraction * g.distance);
     }
     double course = 0;
-    const OmbPoint from = lola(a);
-    const double length = rhumbLength(from, lola(b), &course);
+    const OmbPoint from = lola(a, "Crs.Partway()");
+    const double length = rhumbLength(from, lola(b, "Crs.Partway()"), &course);
     OmbPoint q = alongRhumbLine(from, course, fraction * length);
     project(q);
     return q;
@@ -397,6 +405,93 @@ bool OmbCrs::intersectLineSegments(const OmbPoint& a1, const OmbPoint& a2, const
     if (t < 0 || t > 1 || u < 0 || u > 1) return false;
     crossing = a1 + r * t;
     return true;
+}
+
+// Moves a long/lat point by metres east and north.
+OmbPoint OmbCrs::movedOnGround(const OmbPoint& lola, double east, double north) const {
+    const double lat = lola.y * radiansPerDegree, s = std::sin(lat);
+    const OmbProjCachedNumbers& c = *cached_;
+    return {
+        wrapLongitude(lola.x + east / (c.primeVerticalRadius(s) * std::max(std::cos(lat), 1e-12)) * degreesPerRadian),
+        lola.y + north / c.meridianRadius(s) * degreesPerRadian, lola.z};
+}
+
+int OmbCrs::intersectCircles(const OmbPoint& c1, double r1, const OmbPoint& c2, double r2, OmbPoint& p1,
+                             OmbPoint& p2) const {
+    const OmbPoint centre1 = lola(c1, "Crs.IntersectCircles()"), centre2 = lola(c2, "Crs.IntersectCircles()");
+    // First on the sphere of the equatorial radius: x . u1 = cos(r1 / R),
+    // x . u2 = cos(r2 / R), |x| = 1.
+    const auto unit = [](const OmbPoint& p) {
+        const double lon = p.x * radiansPerDegree, lat = p.y * radiansPerDegree;
+        return OmbPoint(std::cos(lat) * std::cos(lon), std::cos(lat) * std::sin(lon), std::sin(lat));
+    };
+    const double R = datum_->ellipsoid()->equatorialRadius();
+    const OmbPoint u1 = unit(centre1), u2 = unit(centre2);
+    const double cosD = std::clamp(u1.dot3(u2), -1.0, 1.0), sin2D = 1 - cosD * cosD;
+    if (sin2D < 1e-24) return 0;  // concentric or antipodal
+    const double k1 = std::cos(r1 / R), k2 = std::cos(r2 / R);
+    const double a = (k1 - k2 * cosD) / sin2D, b = (k2 - k1 * cosD) / sin2D;
+    const double c2Squared = (1 - (a * a + b * b + 2 * a * b * cosD)) / sin2D;
+    if (c2Squared < -1e-12) return 0;
+    const double c = std::sqrt(std::max(c2Squared, 0.0));
+    const OmbPoint normal = u1.cross(u2);
+    int found = 0;
+    for (const double sign : {1.0, -1.0}) {
+        if (found && c == 0) break;  // touching: one point
+        const OmbPoint x = u1 * a + u2 * b + normal * (sign * c);
+        OmbPoint p(std::atan2(x.y, x.x) * degreesPerRadian, std::atan2(x.z, std::hypot(x.x, x.y)) * degreesPerRadian);
+        // Then Newton's method on the ellipsoid's geodesic distances, whose
+        // gradients point along the arrival azimuths.
+        for (int step = 0; step < 20; ++step) {
+            const OmbGeodesicInverse g1 = geodesic(centre1, p), g2 = geodesic(centre2, p);
+            const double f1 = g1.distance - r1, f2 = g2.distance - r2;
+            if (std::fabs(f1) < 1e-7 && std::fabs(f2) < 1e-7) break;
+            const double a1 = (g1.backAzimuth - 180) * radiansPerDegree, a2 = (g2.backAzimuth - 180) * radiansPerDegree;
+            const double determinant = std::sin(a1) * std::cos(a2) - std::cos(a1) * std::sin(a2);
+            if (std::fabs(determinant) < 1e-12) break;
+            const double east = (-f1 * std::cos(a2) + f2 * std::cos(a1)) / determinant;
+            const double north = (-f2 * std::sin(a1) + f1 * std::sin(a2)) / determinant;
+            p = movedOnGround(p, east, north);
+        }
+        project(p);
+        (found++ ? p2 : p1) = p;
+    }
+    return found;
+}
+
+int OmbCrs::intersectLineSegmentAndCircle(const OmbPoint& a, const OmbPoint& b, const OmbPoint& centre, double radius,
+                                          OmbPoint& p1, OmbPoint& p2) const {
+    const char* operation = "Crs.IntersectLineSegmentAndCircle()";
+    const OmbPoint from = lola(a, operation), to = lola(b, operation), middle = lola(centre, operation);
+    const OmbGeodesicInverse line = geodesic(from, to);
+    const auto at = [&](double t) {
+        return Omb_pointPlusDirectedDistance(*datum_->ellipsoid(), from, line.azimuth, t * line.distance);
+    };
+    const auto miss = [&](double t) { return geodesic(middle, at(t)).distance - radius; };
+    // A geodesic meets a geodesic circle at most twice: find the sign
+    // changes between samples, then bisect each.
+    constexpr int samples = 64;
+    int found = 0;
+    double previous = miss(0);
+    for (int i = 1; i <= samples && found < 2; ++i) {
+        double lo = double(i - 1) / samples, hi = double(i) / samples;
+        const double current = miss(hi);
+        if ((previous < 0) != (current < 0) || current == 0) {
+            double fLo = previous;
+            for (int k = 0; k < 60 && hi - lo > 1e-15; ++k) {
+                const double mid = (lo + hi) / 2, fMid = miss(mid);
+                if ((fLo < 0) == (fMid < 0))
+                    lo = mid, fLo = fMid;
+                else
+                    hi = mid;
+            }
+            OmbPoint p = at((lo + hi) / 2);
+            project(p);
+            (found++ ? p2 : p1) = p;
+        }
+        previous = current;
+    }
+    return found;
 }
 
 double OmbCrs::normalizeCyclicEasting(double x) const {

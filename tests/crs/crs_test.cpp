@@ -217,7 +217,7 @@ TEST_F(Crs, MeasuresOnTheEllipsoid) {
     EXPECT_EQ(errorOf([] {
                   OmbCrs::nonGeoreferenced()->distance({0, 0}, {1, 1});
               }),
-              "Crs.distance() with non-georeferenced projection.");
+              "Crs.Distance() with non-georeferenced projection.");
 }
 
 TEST_F(Crs, CompatibleSystemsDifferByWholeWorlds) {
@@ -415,4 +415,45 @@ TEST_F(Crs, RaysPartwayPointsAndPlaneGeometry) {
     OmbPoint far(100000 + 2 * M_PI * 6378137, 5);
     web.adjustPoint(far);
     EXPECT_NEAR(far.x, 100000, 1e-6);
+}
+
+// Intersections on the ellipsoid, checked with GeographicLib's distances.
+TEST_F(Crs, CirclesAndSegmentsIntersectOnTheEllipsoid) {
+    const OmbCrs& utm = *OmbCrs::wgs84Utm(32, OmbUTMHemisphere::North);
+    const auto projected = [&](OmbPoint p) {
+        utm.project(p);
+        return p;
+    };
+    const auto metresBetween = [&](OmbPoint a, OmbPoint b) {
+        utm.unproject(a);
+        utm.unproject(b);
+        char line[128];
+        std::snprintf(line, sizeof line, "%.12f %.12f %.12f %.12f", a.y, a.x, b.y, b.x);
+        const auto out = runReferenceTool("GeodSolve -i -p 6", {line});
+        double azi1 = 0, azi2 = 0, s = -1;
+        if (!out.empty()) std::istringstream(out[0]) >> azi1 >> azi2 >> s;
+        return s;
+    };
+    const OmbPoint c1 = projected({10, 50}), c2 = projected({14, 51});
+    OmbPoint p1, p2;
+    ASSERT_EQ(utm.intersectCircles(c1, 300000, c2, 250000, p1, p2), 2);
+    for (const OmbPoint& p : {p1, p2}) {
+        EXPECT_NEAR(metresBetween(c1, p), 300000, 1e-3);
+        EXPECT_NEAR(metresBetween(c2, p), 250000, 1e-3);
+    }
+    EXPECT_GT(p1.distanceTo(p2), 1000);
+    EXPECT_EQ(utm.intersectCircles(c1, 50000, c2, 50000, p1, p2), 0);
+
+    const OmbPoint a = projected({5, 49}), b = projected({15, 52});
+    ASSERT_EQ(utm.intersectLineSegmentAndCircle(a, b, c1, 100000, p1, p2), 2);
+    for (const OmbPoint& p : {p1, p2}) {
+        EXPECT_NEAR(metresBetween(c1, p), 100000, 1e-3);
+        EXPECT_NEAR(metresBetween(a, p) + metresBetween(p, b), metresBetween(a, b), 1e-3);
+    }
+    EXPECT_LT(metresBetween(a, p1), metresBetween(a, p2));
+    EXPECT_EQ(errorOf([] {
+                  OmbPoint p, q;
+                  OmbCrs::nonGeoreferenced()->intersectCircles({0, 0}, 1, {1, 0}, 1, p, q);
+              }),
+              "Crs.IntersectCircles() with non-georeferenced projection.");
 }

@@ -170,6 +170,13 @@ public:
     OmbPoint nearestPointOnLine2d(const OmbPointArray& line, const OmbPoint& p, std::size_t& segment) const;
     bool intersectLineSegments(const OmbPoint& a1, const OmbPoint& a2, const OmbPoint& b1, const OmbPoint& b2,
                                OmbPoint& crossing) const;
+    // On the ellipsoid: where two circles of ground radii (metres) about
+    // projected centres cross, and where the geodesic from a to b crosses
+    // a circle (nearest a first); the number of points, 0 to 2.
+    int intersectCircles(const OmbPoint& c1, double r1, const OmbPoint& c2, double r2, OmbPoint& p1,
+                         OmbPoint& p2) const;
+    int intersectLineSegmentAndCircle(const OmbPoint& a, const OmbPoint& b, const OmbPoint& centre, double radius,
+                                      OmbPoint& p1, OmbPoint& p2) const;
 
     // Moves a projected rectangle or point of a cyclic world by whole world
     // widths into the world; an easting likewise.
@@ -278,9 +285,12 @@ private:
     void finish();
     // The shared auxiliary Mercator's constants on this datum, made once.
     const OmbProjCachedNumbers& auxMercatorNumbers() const;
-    // Projected to long/lat on this datum; OmbXInvalidOperation for a
-    // system that is not georeferenced.
-    OmbPoint lola(const OmbPoint& p) const;
+    // Projected to long/lat on this datum; OmbXInvalidOperation naming the
+    // operation for a system that is not georeferenced.
+    OmbPoint lola(const OmbPoint& p, const char* operation) const;
+    // The geodesic between long/lat points (exact near antipodes).
+    OmbGeodesicInverse geodesic(const OmbPoint& from, const OmbPoint& to) const;
+    OmbPoint movedOnGround(const OmbPoint& lola, double east, double north) const;
     // Metres along the rhumb line between two long/lat points, and its
     // course in degrees.
     double rhumbLength(const OmbPoint& from, const OmbPoint& to, double* course = nullptr) const;
