@@ -494,6 +494,14 @@ int OmbCrs::intersectLineSegmentAndCircle(const OmbPoint& a, const OmbPoint& b, 
     return found;
 }
 
+OmbRect OmbCrs::expandRect(const OmbRect& rect, double meters) const {
+    const OmbPoint centre =
+        projection_->safePointForMetersXY({(rect.xmin + rect.xmax) / 2, (rect.ymin + rect.ymax) / 2}, cached_.get());
+    double mx, my;
+    if (!metersXY(centre, mx, my)) nominalMetersXY(mx, my);
+    return rect.extendCopy(meters / mx, meters / my);
+}
+
 double OmbCrs::normalizeCyclicEasting(double x) const {
     OmbRect r(x, 0, x, 0);
     adjustRect(r);

@@ -451,6 +451,14 @@ TEST_F(Crs, CirclesAndSegmentsIntersectOnTheEllipsoid) {
         EXPECT_NEAR(metresBetween(a, p) + metresBetween(p, b), metresBetween(a, b), 1e-3);
     }
     EXPECT_LT(metresBetween(a, p1), metresBetween(a, p2));
+    // A rectangle grown by 10 km: 10 km more ground on each side at its
+    // centre.
+    const OmbRect grown = utm.expandRect({c1.x - 1000, c1.y - 1000, c1.x + 1000, c1.y + 1000}, 10000);
+    EXPECT_NEAR(metresBetween(c1, {c1.x, grown.ymax}), 11000, 1);
+    // The exact geodesic on long/lat degrees agrees with Vincenty's here.
+    const OmbGeodesicInverse exact = utm.distanceAndAzimuthsExactLoLaDeg({10, 50}, {14, 51});
+    EXPECT_NEAR(exact.distance, metresBetween(c1, c2), 1e-3);
+    EXPECT_TRUE(utm.pointAlongRay2dExactLoLaDeg({10, 50}, exact.azimuth, exact.distance).approxEqual({14, 51}, 1e-9));
     EXPECT_EQ(errorOf([] {
                   OmbPoint p, q;
                   OmbCrs::nonGeoreferenced()->intersectCircles({0, 0}, 1, {1, 0}, 1, p, q);

@@ -159,6 +159,18 @@ public:
     OmbString toWellKnownText(bool pretty,
                               OmbWellKnownTextFlavor flavor = OmbWellKnownTextFlavor::OgrWellKnownText) const;
 
+    // On long/lat degrees of this datum, without projecting: the exact
+    // geodesic (root finding, safe for nearly antipodal points), and the
+    // point a distance along it.
+    OmbGeodesicInverse distanceAndAzimuthsExactLoLaDeg(const OmbPoint& from, const OmbPoint& to) const {
+        return Omb_distanceAndAzimuthsExact(*datum_->ellipsoid(), from, to);
+    }
+    OmbPoint pointAlongRay2dExactLoLaDeg(const OmbPoint& from, double azimuth, double distance) const {
+        return Omb_pointPlusDirectedDistance(*datum_->ellipsoid(), from, azimuth, distance);
+    }
+    // A projected rectangle grown on each side by a ground distance, in
+    // units measured at its centre (see metersXY).
+    OmbRect expandRect(const OmbRect& rect, double meters) const;
     // The projected point a ground distance (metres) from p in the azimuth
     // (degrees), along a geodesic or a rhumb line.
     OmbPoint pointAlongRay2d(const OmbPoint& p, double azimuth, double distance, OmbCrsLineType lineType) const;
