@@ -259,17 +259,21 @@ OmbPoint OmbCrs::pointPlusDirectedDistance(const OmbPoint& p, double azimuth, do
     return q;
 }
 
-const OmbProjCachedNumbers& OmbCrs::auxMercatorNumbers() const {
+const OmbCrs::AuxNumbers& OmbCrs::aux() const {
     std::call_once(auxOnce_, [this] {
         const OmbRef<OmbProjection>& mercator = OmbProjection::mercator1SPEllipsoid();
-        auxMercator_.reset(mercator->init(*datum_));
+        aux_.mercator.reset(mercator->init(*datum_));
+        aux_.arcs = std::make_unique<OmbMeriDistProjCachedNumbers>(*datum_, 1, 0);
+        OmbPoint degree(1, 0);
+        mercator->project(degree, aux_.mercator.get());
+        aux_.xPerDegree = degree.x;
     });
-    return *auxMercator_;
+    return aux_;
 }
 
 OmbPoint OmbCrs::onMercatorPlane(const OmbPoint& lola) const {
     OmbPoint p(0, lola.y);
-    OmbProjection::mercator1SPEllipsoid()->project(p, &auxMercatorNumbers());
+    OmbProjection::mercator1SPEllipsoid()->project(p, aux().mercator.get());
     return {lola.x, p.y};
 }
 
@@ -277,11 +281,9 @@ double OmbCrs::rhumbLength(const OmbPoint& from, const OmbPoint& to, double* cou
     // Straight on the Mercator plane: the meridian arc between the
     // latitudes over the cosine of the course, or the parallel's arc.
     const double dLon = wrapLongitude(to.x - from.x);
-    OmbPoint degree(1, 0);
-    OmbProjection::mercator1SPEllipsoid()->project(degree, &auxMercatorNumbers());
-    const double heading = std::atan2(dLon * degree.x, onMercatorPlane(to).y - onMercatorPlane(from).y);
+    const double heading = std::atan2(dLon * aux().xPerDegree, onMercatorPlane(to).y - onMercatorPlane(from).y);
     if (course) *course = heading * degreesPerRadian;
-    const OmbMeriDistProjCachedNumbers arcs(*datum_, 1, 0);
+    const OmbMeriDistProjCachedNumbers& arcs = *aux().arcs;
     const double lat1 = from.y * radiansPerDegree, lat2 = to.y * radiansPerDegree;
     if (std::fabs(lat2 - lat1) < 1e-12)
         return std::fabs(dLon) * radiansPerDegree * arcs.primeVerticalRadius(std::sin(lat1)) * std::cos(lat1);
@@ -290,7 +292,7 @@ double OmbCrs::rhumbLength(const OmbPoint& from, const OmbPoint& to, double* cou
 
 OmbPoint OmbCrs::alongRhumbLine(const OmbPoint& from, double course, double distance) const {
     const double c = course * radiansPerDegree;
-    const OmbMeriDistProjCachedNumbers arcs(*datum_, 1, 0);
+    const OmbMeriDistProjCachedNumbers& arcs = *aux().arcs;
     const double lat1 = from.y * radiansPerDegree;
     if (std::fabs(std::cos(c)) < 1e-12) {
         // Along the parallel.
@@ -298,10 +300,8 @@ OmbPoint OmbCrs::alongRhumbLine(const OmbPoint& from, double course, double dist
         return {wrapLongitude(from.x + std::sin(c) * distance / radius * degreesPerRadian), from.y, from.z};
     }
     const double lat2 = arcs.latitudeFromMeridianDistance(arcs.meridianDistance(lat1) + distance * std::cos(c));
-    OmbPoint degree(1, 0);
-    OmbProjection::mercator1SPEllipsoid()->project(degree, &auxMercatorNumbers());
     const double dy = onMercatorPlane({0, lat2 * degreesPerRadian}).y - onMercatorPlane(from).y;
-    return {wrapLongitude(from.x + std::tan(c) * dy / degree.x), lat2 * degreesPerRadian, from.z};
+    return {wrapLongitude(from.x + std::tan(c) * dy / aux().xPerDegree), lat2 * degreesPerRadian, from.z};
 }
 
 double OmbCrs::length2d(const OmbPointArray& points, OmbCrsLineType lineType, bool closed) const {
@@ -337,7 +337,7 @@ OmbPointArray OmbCrs::route(const OmbPoint& a, const OmbPoint& b, OmbCrsLineType
         for (std::size_t k = 0; k <= segments; ++k) {
             const double t = double(k) / double(segments);
             OmbPoint node(0, y1 + t * (y2 - y1), from.z + t * (to.z - from.z));
-            OmbProjection::mercator1SPEllipsoid()->unproject(node, &auxMercatorNumbers());
+            OmbProjection::mercator1SPEllipsoid()->unproject(node, aux().mercator.get());
             node.x = wrapLongitude(from.x + t * dLon);
             nodes.push_back(node);
         }

@@ -163,13 +163,14 @@ OmbRef<OmbGeodeticDatum> Converter::datum() {
         return OmbGeodeticDatum::wgs84();
     OmbRef<OmbDatumShift> shift = greenwich ? shiftForKnownName(datumName) : OmbRef<OmbDatumShift>();
     if (!shift) {
+        // The definition's TOWGS84, or the one GDAL can guess when the
+        // catalogue has a single Helmert transformation, or the best of
+        // several found through PROJ.
         double towgs84[7] = {};
-        if (srs_.GetTOWGS84(towgs84) != OGRERR_NONE && srs_.AddGuessedTOWGS84() == OGRERR_NONE)
-            srs_.GetTOWGS84(towgs84);
+        const bool hasTowgs84 = srs_.GetTOWGS84(towgs84) == OGRERR_NONE ||
+                                (srs_.AddGuessedTOWGS84() == OGRERR_NONE && srs_.GetTOWGS84(towgs84) == OGRERR_NONE);
         const char* geographic = srs_.GetAuthorityCode("GEOGCS");
-        if (srs_.GetTOWGS84(towgs84) != OGRERR_NONE && geographic)
-            shift = Omb_catalogueShiftToWgs84(std::atoi(geographic));
-        if (!shift && srs_.GetTOWGS84(towgs84) == OGRERR_NONE) {
+        if (hasTowgs84) {
             // GDAL's TOWGS84 rotates in the position-vector sense.
             OmbHelmertDatumShift::Parameters p;
             p.dx = towgs84[0], p.dy = towgs84[1], p.dz = towgs84[2];
@@ -178,6 +179,8 @@ OmbRef<OmbGeodeticDatum> Converter::datum() {
             OmbRef<OmbHelmertDatumShift> helmert(new OmbHelmertDatumShift);
             helmert->parameters(p);
             shift = OmbRef<OmbDatumShift>(helmert);
+        } else if (geographic) {
+            shift = Omb_catalogueShiftToWgs84(std::atoi(geographic));
         }
     }
     const char* datumTitle = srs_.GetAttrValue("DATUM");

@@ -295,8 +295,15 @@ public:
 
 private:
     void finish();
-    // The shared auxiliary Mercator's constants on this datum, made once.
-    const OmbProjCachedNumbers& auxMercatorNumbers() const;
+    // What rhumb-line measurement needs on this datum, made once: the
+    // shared auxiliary Mercator's constants, its x per degree, and the
+    // meridian arcs.
+    struct AuxNumbers {
+        std::unique_ptr<OmbProjCachedNumbers> mercator;
+        std::unique_ptr<OmbMeriDistProjCachedNumbers> arcs;
+        double xPerDegree = 0;
+    };
+    const AuxNumbers& aux() const;
     // Projected to long/lat on this datum; OmbXInvalidOperation naming the
     // operation for a system that is not georeferenced.
     OmbPoint lola(const OmbPoint& p, const char* operation) const;
@@ -321,5 +328,5 @@ private:
     OmbRef<OmbGeodeticDatum> datum_;
     std::unique_ptr<OmbProjCachedNumbers> cached_;
     mutable std::once_flag auxOnce_;
-    mutable std::unique_ptr<OmbProjCachedNumbers> auxMercator_;
+    mutable AuxNumbers aux_;
 };
