@@ -45,8 +45,6 @@ TEST_F(Crs, PredefinedSystemsAndTheirCodes) {
     EXPECT_EQ(OmbCrs::findPredefinedInstance(3006).get(), OmbCrs::SWEREF99TM().get());
     EXPECT_FALSE(OmbRuntime::getPredefinedObject(OmbString("Crs.SWEREF99TM")));
     EXPECT_EQ(OmbCrs::fromUtmProjectionForPoint({-3, 40}).get(), OmbCrs::wgs84Utm(30, OmbUTMHemisphere::North).get());
-    EXPECT_EQ(OmbCrs::nonGeoreferenced()->authorityCode(), OmbString("51003"));
-    EXPECT_FALSE(OmbCrs::screenCoordinateSystem()->projection()->georeferenced());
     EXPECT_EQ(errorOf([] { OmbCrs::wgs84Utm(0, OmbUTMHemisphere::North); }),
               "Value \"zone\" is out of range in wgs84Utm( zone, hemisphere), should be 1, 2, 3, ..., or 60.");
 }

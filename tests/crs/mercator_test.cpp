@@ -84,30 +84,7 @@ TEST_F(Mercator, LongitudesWrapAroundTheCylinder) {
     EXPECT_NEAR(r.xmin, m.project({-10, 0}).x, 1e-6);
 }
 
-TEST_F(Mercator, CompatibleProjectionsDifferByWholeWorlds) {
-    const auto a = mercator(OmbEarthShape::Sphere, 0, 0);
-    const auto b = mercator(OmbEarthShape::Sphere, 90, 0);
-    const double world = 40075016.68557849;
-    b->falseEasting(a->falseEasting() + world / 4);
-    EXPECT_TRUE(a->compatibleWith(*b, world));
-    b->falseEasting(a->falseEasting() + world / 4 + 1);
-    EXPECT_FALSE(a->compatibleWith(*b, world));
-    const auto ellipsoidal = mercator(OmbEarthShape::Ellipsoid, 0, 0);
-    EXPECT_FALSE(a->compatibleWith(*ellipsoidal, world));
-    EXPECT_FALSE(a->compatibleWith(static_cast<const OmbMercator&>(*OmbProjection::miller1SP()), world));
-}
-
 TEST_F(Mercator, StandardParallelOutOfRangeIsRefused) {
     EXPECT_EQ(errorOf([] { OmbMercator().standardParallel(89.5); }),
               "Value \"standardParallel\" is out of range in MercatorProjection, should be in [-89, 89].");
-    const auto c = OmbXmlParser::loadString(
-        OmbString("<Configuration Namespace='M'><MillerCylindricalProjection Name='m' Public='true' Compromise='0.5' "
-                  "CentralLongitude='12' Shape='Sphere' SphereRadiusSource='#equalArea'/></Configuration>"),
-        {}, OmbDataSetInitialization::Delayed, {});
-    const auto miller = omb_dynamic_cast<OmbMiller>(c->getPublicObject(OmbString("m")));
-    ASSERT_TRUE(miller);
-    EXPECT_EQ(miller->compromise(), 0.5);
-    EXPECT_EQ(miller->sphereRadiusSource(), OmbString("#equalArea"));
-    const BoundProjection bound(miller);
-    EXPECT_LT(bound.worstRoundTrip(randomPoints(5, 100, -180, 180, -89, 89)), 1e-9);
 }

@@ -12,8 +12,6 @@
 
 #include <gtest/gtest.h>
 
-#include <functional>
-
 #include "../errortext.h"
 #include "../runtimescope.h"
 #include "projectiontest.h"
@@ -23,13 +21,16 @@ namespace {
 
 class ProjectionMethods : public RuntimeScope {};
 
+// One method: its configuration element, PROJ's definition of the same
+// projection (on the ellipsoid below unless it names one), the long/lat
+// domain of the random points, and the tolerance in metres (the geodesics
+// of the azimuthal equidistant projection differ by up to 1.3 mm near the
+// antipode).
 struct Method {
-    const char* name;
-    std::function<OmbRef<OmbProjection>()> make;
-    std::string proj;  // the same projection for cs2cs, on the ellipsoid below unless it names one
-    OmbRect domain;    // long/lat
-    double tolerance;  // metres; the geodesics of the azimuthal equidistant
-                       // projection differ by up to 1.3 mm near the antipode
+    const char* element;
+    std::string proj;
+    OmbRect domain;
+    double tolerance = 1e-5;
     const char* ellipsoid = "WGS84";
 };
 
@@ -39,182 +40,81 @@ OmbRef<OmbGeodeticDatum> datumOn(const std::string& ellipsoid) {
     return OmbRef<OmbGeodeticDatum>(new OmbGeodeticDatum(e, OmbPrimeMeridian::greenwich(), OmbRef<OmbDatumShift>()));
 }
 
-template <class P>
-OmbRef<OmbProjection> made(P* projection, const std::function<void(P&)>& setUp) {
-    setUp(*projection);
-    return OmbRef<OmbProjection>(projection);
+// The projection an element describes, read as the public object "p".
+OmbRef<OmbProjection> read(const std::string& element) {
+    const std::size_t tagEnd = element.find_first_of(" /");
+    const std::string text = "<Configuration Namespace='M'>" + element.substr(0, tagEnd) + " Name='p' Public='true'" +
+                             element.substr(tagEnd) + "</Configuration>";
+    const auto c = OmbXmlParser::loadString(OmbString(text), {}, OmbDataSetInitialization::Delayed, {});
+    return omb_dynamic_cast<OmbProjection>(c->getPublicObject(OmbString("p")));
 }
 
-std::vector<Method> methods() {
-    using Stereo = OmbStereographicVariant;
-    return {
-        {"Lambert conformal conic",
-         [] { return OmbRef<OmbProjection>(new OmbLambertConformalConic2SP(10, 52, 35, 65, 4e6, 2.8e6)); },
-         "+proj=lcc +lat_0=52 +lon_0=10 +lat_1=35 +lat_2=65 +x_0=4000000 +y_0=2800000",
-         {-30, 20, 50, 80},
-         1e-5},
-        {"Lambert conformal conic, south",
-         [] { return OmbRef<OmbProjection>(new OmbLambertConformalConic2SP(-60, -30, -20, -45, 0, 0, 0.999)); },
-         "+proj=lcc +lat_0=-30 +lon_0=-60 +lat_1=-20 +lat_2=-45 +k_0=0.999",
-         {-120, -85, 0, 10},
-         1e-5},
-        {"UPS north", [] { return OmbProjection::upsNorth(); }, "+proj=ups", {-180, 60, 180, 90}, 1e-5},
-        {"UPS south", [] { return OmbProjection::upsSouth(); }, "+proj=ups +south", {-180, -90, 180, -60}, 1e-5},
-        {"polar stereographic with a standard parallel",
-         [] {
-             return made<OmbPolarStereographic>(new OmbPolarStereographic(false), [](OmbPolarStereographic& p) {
-                 p.standardParallel(-71);
-                 p.centralLongitude(20);
-             });
-         },
-         "+proj=stere +lat_0=-90 +lat_ts=-71 +lon_0=20",
-         {-180, -90, 180, -50},
-         1e-5},
-        {"stereographic, United States",
-         [] { return OmbRef<OmbProjection>(new OmbStereographic(-100, 40, 0.9999, Stereo::UnitedStates, 1e5, 2e5)); },
-         "+proj=stere +lat_0=40 +lon_0=-100 +k_0=0.9999 +x_0=100000 +y_0=200000",
-         {-160, -20, -40, 89},
-         1e-5},
-        {"stereographic, International",
-         [] {
-             return OmbRef<OmbProjection>(new OmbStereographic(5.38763888888889, 52.15616055555555, 0.9999079,
-                                                               Stereo::International, 155000, 463000));
-         },
-         "+proj=sterea +lat_0=52.15616055555555 +lon_0=5.38763888888889 +k=0.9999079 +x_0=155000 +y_0=463000",
-         {-60, -20, 70, 89},
-         1e-6,
-         "bessel"},
-        {"orthographic",
-         [] { return OmbRef<OmbProjection>(new OmbOrthographic(-100, 40, 1000, 2000)); },
-         "+proj=ortho +lat_0=40 +lon_0=-100 +x_0=1000 +y_0=2000",
-         {-150, 0, -50, 80},
-         1e-5},
-        {"azimuthal equidistant",
-         [] {
-             return made<OmbAzimuthalEquidistant>(new OmbAzimuthalEquidistant,
-                                                  [](OmbAzimuthalEquidistant& p) { p.set(-100, 40); });
-         },
-         "+proj=aeqd +lat_0=40 +lon_0=-100",
-         {-180, -80, 180, 89},
-         1.5e-3},
-        {"azimuthal equidistant, sphere",
-         [] {
-             return made<OmbAzimuthalEquidistant>(new OmbAzimuthalEquidistant, [](OmbAzimuthalEquidistant& p) {
-                 p.set(30, -20);
-                 p.shape(OmbEarthShape::Sphere);
-                 p.sphereRadiusSource(OmbString("#radiusFromArgument"));
-                 p.sphereRadius(6371000);
-             });
-         },
-         "+proj=aeqd +lat_0=-20 +lon_0=30 +R=6371000",
-         {-180, -89, 180, 89},
-         1e-5},
-        {"equidistant cylindrical, sphere",
-         [] {
-             return made<OmbEquidistantCylindrical>(new OmbEquidistantCylindrical, [](OmbEquidistantCylindrical& p) {
-                 p.shape(OmbEarthShape::Sphere);
-                 p.standardParallel(30);
-                 p.centralLongitude(10);
-                 p.centralLatitude(5);
-             });
-         },
-         "+proj=eqc +lat_ts=30 +lat_0=5 +lon_0=10 +R=6378137",
-         {-170, -89, 190, 89},
-         1e-5},
-        {"Krovak",
-         [] { return OmbRef<OmbProjection>(new OmbKrovak); },
-         "+proj=krovak +lat_0=49.5 +lon_0=24.83333333333333 +alpha=30.28813975277778 +k=0.9999",
-         {12, 47.5, 23, 51.5},
-         1e-5,
-         "bessel"},
-        {"Rosenmund oblique Mercator",
-         [] {
-             return made<OmbRosenmundObliqueMercator>(
-                 new OmbRosenmundObliqueMercator, [](OmbRosenmundObliqueMercator& p) {
-                     p.centralLatitude(46.95240555555556), p.centralLongitude(7.439583333333333);
-                     p.falseEasting(600000), p.falseNorthing(200000);
-                 });
-         },
-         "+proj=somerc +lat_0=46.95240555555556 +lon_0=7.439583333333333 +x_0=600000 +y_0=200000",
-         {0, 40, 15, 55},
-         1e-5,
-         "bessel"},
-        {"Albers equal area conic",
-         [] {
-             return made<OmbAlbersEqualAreaConic>(new OmbAlbersEqualAreaConic, [](OmbAlbersEqualAreaConic& p) {
-                 p.centralLongitude(-96), p.centralLatitude(23), p.standardParallel1(29.5), p.standardParallel2(45.5);
-                 p.falseEasting(1000), p.falseNorthing(-500);
-             });
-         },
-         "+proj=aea +lat_0=23 +lon_0=-96 +lat_1=29.5 +lat_2=45.5 +x_0=1000 +y_0=-500",
-         {-130, 20, -60, 55},
-         1e-6,
-         "GRS80"},
-        {"Lambert azimuthal equal area",
-         [] {
-             return made<OmbAzimuthalEqualArea>(new OmbAzimuthalEqualArea, [](OmbAzimuthalEqualArea& p) {
-                 p.set(10, 52), p.falseEasting(4321000), p.falseNorthing(3210000);
-             });
-         },
-         "+proj=laea +lat_0=52 +lon_0=10 +x_0=4321000 +y_0=3210000",
-         {-40, 20, 60, 85},
-         1e-6,
-         "GRS80"},
-        {"Cassini-Soldner",
-         [] {
-             return made<OmbCassiniSoldner>(new OmbCassiniSoldner, [](OmbCassiniSoldner& p) {
-                 p.centralLongitude(-61.3333), p.centralLatitude(10.4416), p.falseEasting(430000),
-                     p.falseNorthing(325000);
-             });
-         },
-         "+proj=cass +lat_0=10.4416 +lon_0=-61.3333 +x_0=430000 +y_0=325000",
-         {-62, 10, -60.5, 11},
-         1e-5},
-        {"Hotine oblique Mercator, natural origin",
-         [] {
-             return made<OmbHotineObliqueMercator>(new OmbHotineObliqueMercator, [](OmbHotineObliqueMercator& p) {
-                 p.centralLatitude(4), p.centralLongitude(115), p.azimuth(53.31582047222222);
-                 p.rectifiedGridAngle(53.13010236111111), p.scaleFactor(0.99984);
-                 p.trueOrigin(OmbHotineObliqueMercatorTrueOrigin::HotineNaturalOriginNearEquator);
-             });
-         },
-         "+proj=omerc +no_uoff +lat_0=4 +lonc=115 +alpha=53.31582047222222 +gamma=53.13010236111111 +k=0.99984",
-         {110, 1, 120, 8},
-         1e-5},
-        {"Hotine oblique Mercator, centre",
-         [] {
-             return made<OmbHotineObliqueMercator>(new OmbHotineObliqueMercator, [](OmbHotineObliqueMercator& p) {
-                 p.centralLatitude(46), p.centralLongitude(16), p.azimuth(30), p.scaleFactor(0.9999);
-             });
-         },
-         "+proj=omerc +lat_0=46 +lonc=16 +alpha=30 +gamma=0 +k=0.9999",
-         {10, 40, 22, 52},
-         1e-5},
-        {"Laborde",
-         [] {
-             return made<OmbLabordeObliqueMercator>(new OmbLabordeObliqueMercator, [](OmbLabordeObliqueMercator& p) {
-                 p.centralLatitude(-18.9), p.centralLongitude(46.43722916666667), p.azimuth(18.9),
-                     p.scaleFactor(0.9995);
-             });
-         },
-         "+proj=labrd +lat_0=-18.9 +lon_0=46.43722916666667 +azi=18.9 +k_0=0.9995",
-         {43, -25, 50, -12},
-         1e-5},
-        {"New Zealand map grid",
-         [] { return OmbRef<OmbProjection>(new OmbNewZealandMapGrid); },
-         "+proj=nzmg +ellps=intl",
-         {166, -47, 179, -34},
-         1e-5},
-    };
-}
+// clang-format off
+const Method methods[] = {
+    {"<LambertConformalConicProjection CentralLongitude='10' CentralLatitude='52' StandardParallel1='35' "
+     "StandardParallel2='65' FalseEasting='4e6' FalseNorthing='2.8e6'/>",
+     "+proj=lcc +lat_0=52 +lon_0=10 +lat_1=35 +lat_2=65 +x_0=4000000 +y_0=2800000", {-30, 20, 50, 80}},
+    {"<LambertConformalConicProjection CentralLongitude='-60' CentralLatitude='-30' StandardParallel1='-20' "
+     "StandardParallel2='-45' ScaleFactor='0.999'/>",
+     "+proj=lcc +lat_0=-30 +lon_0=-60 +lat_1=-20 +lat_2=-45 +k_0=0.999", {-120, -85, 0, 10}},
+    {"<ResourceReference Predefined='true' Value='Projections.UPS_North'/>", "+proj=ups", {-180, 60, 180, 90}},
+    {"<ResourceReference Predefined='true' Value='Projections.UPS_South'/>", "+proj=ups +south", {-180, -90, 180, -60}},
+    {"<PolarStereographicProjection NorthPole='false' StandardParallel='-71' CentralLongitude='20'/>",
+     "+proj=stere +lat_0=-90 +lat_ts=-71 +lon_0=20", {-180, -90, 180, -50}},
+    {"<StereographicProjection CentralLongitude='-100' CentralLatitude='40' ScaleFactor='0.9999' "
+     "FalseEasting='1e5' FalseNorthing='2e5'/>",
+     "+proj=stere +lat_0=40 +lon_0=-100 +k_0=0.9999 +x_0=100000 +y_0=200000", {-160, -20, -40, 89}},
+    {"<StereographicProjection CentralLongitude='5.38763888888889' CentralLatitude='52.15616055555555' "
+     "ScaleFactor='0.9999079' FalseEasting='155000' FalseNorthing='463000' Variant='International'/>",
+     "+proj=sterea +lat_0=52.15616055555555 +lon_0=5.38763888888889 +k=0.9999079 +x_0=155000 +y_0=463000",
+     {-60, -20, 70, 89}, 1e-5, "bessel"},
+    {"<OrthographicProjection CentralLongitude='-100' CentralLatitude='40' FalseEasting='1000' FalseNorthing='2000'/>",
+     "+proj=ortho +lat_0=40 +lon_0=-100 +x_0=1000 +y_0=2000", {-150, 0, -50, 80}},
+    {"<AzimuthalEquidistantProjection CentralLongitude='-100' CentralLatitude='40'/>",
+     "+proj=aeqd +lat_0=40 +lon_0=-100", {-180, -80, 180, 89}, 1.5e-3},
+    {"<AzimuthalEquidistantProjection CentralLongitude='30' CentralLatitude='-20' Shape='Sphere' "
+     "SphereRadiusSource='#radiusFromArgument' SphereRadius='6371000'/>",
+     "+proj=aeqd +lat_0=-20 +lon_0=30 +R=6371000", {-180, -89, 180, 89}},
+    {"<EquidistantCylindricalProjection Shape='Sphere' StandardParallel='30' CentralLongitude='10' "
+     "CentralLatitude='5'/>",
+     "+proj=eqc +lat_ts=30 +lat_0=5 +lon_0=10 +R=6378137", {-170, -89, 190, 89}},
+    {"<KrovakNorthOrientedProjection/>",
+     "+proj=krovak +lat_0=49.5 +lon_0=24.83333333333333 +alpha=30.28813975277778 +k=0.9999", {12, 47.5, 23, 51.5},
+     1e-5, "bessel"},
+    {"<RosenmundObliqueMercatorProjection CentralLatitude='46.95240555555556' CentralLongitude='7.439583333333333' "
+     "FalseEasting='600000' FalseNorthing='200000'/>",
+     "+proj=somerc +lat_0=46.95240555555556 +lon_0=7.439583333333333 +x_0=600000 +y_0=200000", {0, 40, 15, 55},
+     1e-5, "bessel"},
+    {"<AlbersEqualAreaConicProjection CentralLongitude='-96' CentralLatitude='23' StandardParallel1='29.5' "
+     "StandardParallel2='45.5' FalseEasting='1000' FalseNorthing='-500'/>",
+     "+proj=aea +lat_0=23 +lon_0=-96 +lat_1=29.5 +lat_2=45.5 +x_0=1000 +y_0=-500", {-130, 20, -60, 55}, 1e-5,
+     "GRS80"},
+    {"<AzimuthalEqualAreaProjection CentralLongitude='10' CentralLatitude='52' FalseEasting='4321000' "
+     "FalseNorthing='3210000'/>",
+     "+proj=laea +lat_0=52 +lon_0=10 +x_0=4321000 +y_0=3210000", {-40, 20, 60, 85}, 1e-5, "GRS80"},
+    {"<CassiniSoldnerProjection CentralLongitude='-61.3333' CentralLatitude='10.4416' FalseEasting='430000' "
+     "FalseNorthing='325000'/>",
+     "+proj=cass +lat_0=10.4416 +lon_0=-61.3333 +x_0=430000 +y_0=325000", {-62, 10, -60.5, 11}},
+    {"<HotineObliqueMercatorProjection CentralLatitude='4' CentralLongitude='115' Azimuth='53.31582047222222' "
+     "RectifiedGridAngle='53.13010236111111' ScaleFactor='0.99984' TrueOrigin='HotineNaturalOriginNearEquator'/>",
+     "+proj=omerc +no_uoff +lat_0=4 +lonc=115 +alpha=53.31582047222222 +gamma=53.13010236111111 +k=0.99984",
+     {110, 1, 120, 8}},
+    {"<HotineObliqueMercatorProjection CentralLatitude='46' CentralLongitude='16' Azimuth='30' ScaleFactor='0.9999'/>",
+     "+proj=omerc +lat_0=46 +lonc=16 +alpha=30 +gamma=0 +k=0.9999", {10, 40, 22, 52}},
+    {"<LabordeObliqueMercatorProjection CentralLatitude='-18.9' CentralLongitude='46.43722916666667' Azimuth='18.9' "
+     "ScaleFactor='0.9995'/>",
+     "+proj=labrd +lat_0=-18.9 +lon_0=46.43722916666667 +azi=18.9 +k_0=0.9995", {43, -25, 50, -12}},
+    {"<NewZealandMapGridProjection/>", "+proj=nzmg +ellps=intl", {166, -47, 179, -34}},
+};
+// clang-format on
 
 }  // namespace
 
 TEST_F(ProjectionMethods, AgreeWithProjAndReturnEveryPoint) {
     unsigned seed = 1;
-    for (const Method& m : methods()) {
-        SCOPED_TRACE(m.name);
-        const OmbRef<OmbProjection> projection = m.make();
+    for (const Method& m : methods) {
+        SCOPED_TRACE(m.element);
+        const OmbRef<OmbProjection> projection = read(m.element);
         ASSERT_TRUE(projection);
         const BoundProjection bound(projection, datumOn(m.ellipsoid));
         const auto points = randomPoints(seed++, 2000, m.domain.xmin, m.domain.xmax, m.domain.ymin, m.domain.ymax);

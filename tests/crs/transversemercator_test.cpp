@@ -153,33 +153,3 @@ TEST_F(TransverseMercator, UtmZonesAndTheirErrors) {
               "Value \"zone\" is out of range in utm( zone, hemisphere), should be 1, 2, 3, ..., or 60. Row 2, "
               "Column 3.");
 }
-
-TEST_F(TransverseMercator, ReadFromAConfigurationAndSavedAgain) {
-    const char* text = R"(<?xml version="1.0" encoding="utf-8"?>
-<Configuration Namespace="T">
-  <LengthUnit Name="usFoot" InMeters="0.3048006096012192" />
-  <TransverseMercatorProjection Name="tm" Public="true" CentralLatitude="31" CentralLongitude="-110.16666666666667"
-      FalseEasting="700000" ScaleFactor="0.9999" LengthUnit="{ResourceReference Value=usFoot}" />
-  <UtmProjection Name="utm" Public="true" Zone="12" Hemisphere="South" />
-</Configuration>)";
-    OmbRef<OmbConfiguration> config =
-        OmbXmlParser::loadString(OmbString(text), {}, OmbDataSetInitialization::Delayed, {});
-    auto tm = omb_dynamic_cast<OmbTransverseMercator>(config->getPublicObject(OmbString("tm")));
-    ASSERT_TRUE(tm);
-    EXPECT_EQ(tm->centralLatitude(), 31);
-    EXPECT_EQ(tm->scaleFactor(), 0.9999);
-    EXPECT_EQ(tm->metersPerProjUnit(), 0.3048006096012192);
-    BoundProjection bound(tm);
-    const OmbPoint origin = bound.project({-110.16666666666667, 31});
-    EXPECT_NEAR(origin.x, 700000, 1e-6);
-    EXPECT_NEAR(origin.y, 0, 1e-6);
-    auto utm = omb_dynamic_cast<OmbUTM>(config->getPublicObject(OmbString("utm")));
-    ASSERT_TRUE(utm);
-    EXPECT_EQ(utm->name(), OmbString("utm"));
-    EXPECT_EQ(utm->centralLongitude(), -111);
-    EXPECT_EQ(utm->falseNorthing(), 10000000);
-    const auto again = OmbXmlParser::loadString(tm->save(), {}, OmbDataSetInitialization::Delayed, {});
-    const auto reread = omb_dynamic_cast<OmbTransverseMercator>(again->getPublicObject(OmbString("tm")));
-    ASSERT_TRUE(reread);
-    EXPECT_TRUE(reread->equivalent(*tm));
-}
